@@ -1,0 +1,249 @@
+// BER element conventions shared by every grammar unit: tag tests, element
+// windows, content blocks in their windowed and end-of-contents-delimited
+// forms, the end-of-contents unit, element loops, choices and repetitions.
+#pragma once
+
+#include <cstdint>
+
+#include "engine/emit.h"
+
+namespace camel {
+
+// ---- Tag tests: peek only, nothing consumed, nothing emitted ---------------
+
+namespace detail {
+// The test leaves what it read in span 0 and the field value, as the host
+// may inspect the field record after a pass.
+inline void noteTestedIdentifier(DecodeState *st, uint32_t bits, uint32_t value) {
+    st->field.value = value;
+    if (st->field.spans != nullptr && st->field.spanCapacity > 0) {
+        st->field.spans[0].value = value;
+        st->field.spans[0].firstBit = st->bitCursor;
+        st->field.spans[0].lastBit = st->bitCursor + bits - 1;
+    }
+}
+} // namespace detail
+
+// Whole-octet test: the identifier octet equals `expected`.
+inline bool tagTest(DecodeState *st, uint32_t expected) {
+    if (!room(st, 8))
+        return false;
+    const uint32_t octet = peekOctet(st);
+    detail::noteTestedIdentifier(st, 8, octet);
+    return octet == expected;
+}
+
+// Class-and-number test: class * 32 + number equals `expected`; the form
+// bit is ignored, so [0] matches both 0x80 and 0xA0 as 64.
+inline bool tagTestClassNumber(DecodeState *st, uint32_t expected) {
+    if (!room(st, 8))
+        return false;
+    const uint32_t octet = peekOctet(st);
+    const uint32_t value = (octet >> 6) * 32 + (octet & 0x1Fu);
+    detail::noteTestedIdentifier(st, 8, value);
+    return value == expected;
+}
+
+// Two-octet test (tag numbers above 30): the first octet is the low byte,
+// so BF 32 compares as 0x32BF.
+inline bool tagTest16(DecodeState *st, uint32_t expected) {
+    if (!room(st, 16))
+        return false;
+    const uint32_t value = peekOctet(st) | (octetAt(st, 8) << 8);
+    detail::noteTestedIdentifier(st, 16, value);
+    return value == expected;
+}
+
+// A mandatory element whose tag is missing.
+inline void mandatoryMissing(DecodeState *st) { st->errorFlags |= DPX_ERR_MANDATORY_MISSING; }
+
+// ---- Element windows ---------------------------------------------------------
+
+// Narrows the window to the element at the cursor, whose identifier takes
+// `idBits` and whose BER length follows it, and pushes the window's end.
+// An element longer than the window sets the length-beyond flag, keeps the
+// enclosing window and reports `overflow`; the caller then clears the
+// present flag of its context so that the construct's later members are
+// skipped.  A length whose octets are not in the window leaves the window
+// as it is: the length field itself will not fit.  0 when a stack cannot
+// grow.
+inline int openElementWindow(DecodeState *st, uint32_t idBits, bool *overflow) {
+    *overflow = false;
+    const LengthPeek len = peekLength(st, idBits);
+    if (len.fits) {
+        const uint64_t total = idBits + len.bits + len.value * 8;
+        *overflow = !narrowWindow(st, total);
+    }
+    return pushEnd(st);
+}
+
+// Closes a window opened by openElementWindow or a content block, together
+// with the element start pushed before it: leftovers are flagged and
+// skipped, then the position and the window are popped.
+template <Pass P>
+inline void closeElementWindow(DecodeState *st, Request<P> *rq) {
+    skipLeftover(st);
+    popPos(st);
+    popEnd(st);
+    noteStatus<P>(st, rq);
+}
+
+// ---- End of contents -----------------------------------------------------------
+
+// The end-of-contents check of an EOC-delimited block: two zero octets close
+// the block (eocSeen) and are reported as "End of contents".
+template <Pass P>
+inline int eocCheck(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    if (ctx->present == 0 || ctx->eocSeen != 0)
+        return 1;
+    if (!room(st, 16) || peekOctet(st) != 0 || octetAt(st, 8) != 0)
+        return 1;
+    ctx->eocSeen = 1;
+    if (!elementStart(st, "End Of Contents"))
+        return 0;
+    if (ctx->present != 0 && room(st, 16)) {
+        if (!bitsField<P, fid::kEndOfContents>(st, rq, 0, 16, 16))
+            return 0;
+    }
+    popPos(st);
+    noteStatus<P>(st, rq);
+    return 1;
+}
+
+// ---- Content blocks ------------------------------------------------------------
+
+// A member of a block: called with the block's context and the in-EOC-block
+// flag, returns 1 or 0 like any unit.
+//   [&](ElementContext *c, uint32_t inEoc) { return decodeX<P>(st, c, inEoc, rq); }
+
+// The content block of a delimited construct, entered right after its
+// length field (it reads `lengthValue`).  A definite length opens a window
+// of that many octets and runs the members in order inside it; the
+// indefinite form (and a length of zero) runs them with an end-of-contents
+// check before each, and the first EOC met closes the block.  The EOC that
+// follows the last member is left to the enclosing block.
+template <Pass P, class... Members>
+inline int contentBlock(DecodeState *st, ElementContext *ctx, Request<P> *rq,
+                        const char *blockName, Members &&...members) {
+    if (ctx->present == 0)
+        return 1;
+    const uint32_t length = g_scratch<P>.lengthValue;
+    if (blockName != nullptr)
+        setElementName(st, blockName);
+    if (!pushPos(st))
+        return 0;
+    if (length != 0) {
+        if (!narrowWindow(st, static_cast<uint64_t>(length) * 8))
+            ctx->present = 0;
+        if (!pushEnd(st))
+            return 0;
+        ElementContext block{0, 1, 0, 0};
+        bool ok = true;
+        ((ok = ok && (block.present == 0 || members(&block, 0u) != 0)), ...);
+        if (!ok)
+            return 0;
+        closeElementWindow<P>(st, rq);
+        return 1;
+    }
+    ElementContext block{0, ctx->present, 0, 0};
+    bool ok = true;
+    ((ok = ok && eocCheck<P>(st, &block, rq) != 0 &&
+           (block.present == 0 || block.eocSeen != 0 || members(&block, 1u) != 0)),
+     ...);
+    if (!ok)
+        return 0;
+    ctx->present = block.present;
+    popPos(st);
+    noteStatus<P>(st, rq);
+    return 1;
+}
+
+// A delimited construct whose tag test has succeeded: element start, tag
+// field, length field, content block, element end.
+template <Pass P, uint32_t TagId, uint32_t LengthId, class... Members>
+inline int delimitedConstruct(DecodeState *st, ElementContext *ctx, Request<P> *rq,
+                              const char *name, const char *blockName, Members &&...members) {
+    if (!elementStart(st, name))
+        return 0;
+    if (!octetField<P, TagId>(st, ctx, rq) || !lengthField<P, LengthId>(st, ctx, rq))
+        return 0;
+    if (!contentBlock<P>(st, ctx, rq, blockName, members...))
+        return 0;
+    popPos(st);
+    noteStatus<P>(st, rq);
+    return 1;
+}
+
+// ---- Element loop ----------------------------------------------------------------
+
+// The members of an argument SEQUENCE, tried in sweeps until N consecutive
+// members miss, the window is used up or a sweep makes no progress.  A
+// member is a callable  int(ElementContext *ctx, bool &matched)  that tests
+// its tag, sets `matched` and, when it matched, decodes its element.
+template <Pass P, class... Members>
+inline int elementLoop(DecodeState *st, ElementContext *ctx, Request<P> *rq,
+                       Members &&...members) {
+    constexpr uint32_t n = sizeof...(Members);
+    st->occurrenceCounter = 0;
+    bool firstSweep = true;
+    uint32_t sweepStart = 0;
+    while (st->remainingBits != 0 && ctx->present != 0 && st->occurrenceCounter < n &&
+           (firstSweep || st->bitCursor != sweepStart)) {
+        firstSweep = false;
+        sweepStart = st->bitCursor;
+        bool ok = true;
+        auto tryMember = [&](auto &member) {
+            if (!ok || ctx->present == 0 || st->occurrenceCounter >= n)
+                return;
+            bool matched = false;
+            if (member(ctx, matched) == 0) {
+                ok = false;
+                return;
+            }
+            if (matched)
+                st->occurrenceCounter = 0;
+            else
+                ++st->occurrenceCounter;
+        };
+        (tryMember(members), ...);
+        if (!ok)
+            return 0;
+    }
+    st->occurrenceCounter = 0;
+    noteStatus<P>(st, rq);
+    return 1;
+}
+
+// ---- Choice and repetition -------------------------------------------------------
+
+// A "Choice" field: the alternative's identifier octet, reported by name
+// and kept in `choiceTag` for the selection that follows.
+template <Pass P, uint32_t Id>
+inline int choiceField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    if (ctx->present == 0 || !room(st, 8)) {
+        ctx->present = 0;
+        return 1;
+    }
+    if (!bitsField<P, Id>(st, rq, 0, 8, 8))
+        return 0;
+    g_scratch<P>.choiceTag = st->field.value;
+    return 1;
+}
+
+// SEQUENCE OF at argument level: items while the next identifier is
+// `itemTag`, at most 255.  `item` is a callable  int(ElementContext *ctx).
+template <Pass P, class Item>
+inline int repeatItems(DecodeState *st, ElementContext *ctx, Request<P> *rq, uint32_t itemTag,
+                       Item &&item) {
+    uint32_t count = 0;
+    while (ctx->present != 0 && count < 255 && tagTest(st, itemTag)) {
+        ++count;
+        ++ctx->occurrenceCount;
+        if (item(ctx) == 0)
+            return 0;
+    }
+    noteStatus<P>(st, rq);
+    return 1;
+}
+
+} // namespace camel

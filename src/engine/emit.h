@@ -1,0 +1,312 @@
+// Building a field in the field record and reporting it in each pass's way.
+//
+// A unit builds a field in four steps (reset and label, spans, finish,
+// report) through the helpers below; only `report` differs per pass, and
+// it is the one place where a pass shows.
+#pragma once
+
+#include <cstdint>
+#include <cstring>
+#include <string>
+
+#include "dpx_camel.h"
+#include "engine/cursor.h"
+#include "engine/pass.h"
+#include "engine/scratch.h"
+#include "engine/text.h"
+#include "fields/field_table.h"
+#include "keyfields/key_marks.h"
+
+namespace camel {
+
+// Message-view pass: any error flag makes the message invalid.
+template <Pass P>
+inline void noteStatus(const DecodeState *st, Request<P> *rq) {
+    if constexpr (P == Pass::MessageView) {
+        if (st->errorFlags != 0)
+            rq->status = DPX_STATUS_INVALID;
+    } else {
+        (void)st;
+        (void)rq;
+    }
+}
+
+// Reset the field record and copy the field's label into it.
+template <uint32_t Id>
+inline void beginField(DecodeState *st) {
+    ResetFieldRecord(&st->field);
+    constexpr const char *label = Field<Id>::def.label;
+    constexpr size_t n = std::char_traits<char>::length(label);
+    static_assert(n < DPX_TEXT_BUFFER_SIZE, "label longer than the host's label buffer");
+    if (st->field.label != nullptr)
+        std::memcpy(st->field.label, label, n + 1);
+}
+
+// Makes span `highest` writable; flags and fails when the array cannot grow.
+inline int ensureSpans(DecodeState *st, uint32_t highest) {
+    void *spans = st->field.spans;
+    if (!EnsureSlot(&spans, highest, &st->field.spanCapacity, sizeof(ValueSpan))) {
+        st->field.spans = nullptr;
+        st->errorFlags |= DPX_ERR_SPAN_GROWTH;
+        return 0;
+    }
+    st->field.spans = static_cast<ValueSpan *>(spans);
+    return 1;
+}
+
+// Fills span `index` over the bits [cursor + from, cursor + to] (offsets
+// from the cursor, to >= from, at most 32 bits) and returns its value.
+inline uint32_t setSpan(DecodeState *st, uint32_t index, uint32_t from, uint32_t to) {
+    ValueSpan &s = st->field.spans[index];
+    s.firstBit = st->bitCursor + from;
+    s.lastBit = st->bitCursor + to;
+    s.value = ExtractBits(st->buffer, s.firstBit, s.lastBit);
+    s.flags = 0;
+    st->field.spansFilled = index + 1;
+    return s.value;
+}
+
+namespace detail {
+
+inline const char *nameOf(const FieldDef &f, uint32_t value) {
+    for (uint16_t i = 0; i < f.nameCount; ++i)
+        if (f.names[i].code == value)
+            return f.names[i].name;
+    return "";
+}
+
+inline void renderValue(const FieldDef &f, const FieldRecord &field, TextBuf &out) {
+    switch (f.render) {
+    case Render::Tag:
+    case Render::Hex:
+        out.hex(field.value);
+        break;
+    case Render::Unsigned:
+        out.decimal(field.value);
+        break;
+    case Render::LenHeader:
+        out.decimal(field.value);
+        out.append(" octet(s)");
+        break;
+    case Render::LenBlock:
+        if (field.value == 0) {
+            out.append("Indefinite Length");
+        } else {
+            out.decimal(field.value);
+            out.append(" Octet(s)");
+        }
+        break;
+    case Render::Digits:
+        for (uint32_t i = 0; i < field.spansReported; ++i)
+            out.hex(field.spans[i].value);
+        break;
+    case Render::Enum:
+        out.append(nameOf(f, field.value));
+        break;
+    }
+}
+
+inline uint32_t spanSelector(const FieldDef &f, uint32_t spans) {
+    if (f.selector != 0xFF)
+        return f.selector;
+    if (f.render == Render::Digits)
+        return 1;
+    return spans > 1 ? spans - 1 : 0;
+}
+
+} // namespace detail
+
+// Step 8 of every field: hand the finished field to the host in the pass's
+// way.  Returns 0 only when the pass must end (a key value that does not fit).
+template <Pass P, uint32_t Id>
+inline int report(DecodeState *st, Request<P> *rq) {
+    constexpr const FieldDef &f = Field<Id>::def;
+    if constexpr (P == Pass::Decoded || P == Pass::Display) {
+        TextBuffers &buf = g_text<P>;
+        TextBuf text{buf.text, sizeof buf.text, 0};
+        TextBuf value{buf.valueText, sizeof buf.valueText, 0};
+        text.clear();
+        value.clear();
+        detail::renderValue(f, st->field, value);
+        if constexpr (P == Pass::Decoded) {
+            if (rq->outputLines != nullptr) {
+                char *line = rq->outputLines +
+                             static_cast<size_t>(rq->currentLineIndex) * DPX_OUTPUT_LINE_SIZE;
+                line[0] = static_cast<char>(rq->layerCode);
+                line[1] = 0;
+                line[2] = 0;
+            }
+            text.blanks(f.textIndent);
+            text.append(f.label);
+            text.append("=", 1);
+            text.append(value.data, value.len);
+            pu_AddDecodedFieldsData(rq, st->field.spansReported, st->field.spans, text.data,
+                                    detail::spanSelector(f, st->field.spansReported),
+                                    st->field.label, Id, 0, 0);
+        } else {
+            text.append(value.data, value.len);
+            pu_AddFieldsToDisplayData(rq, text.data, Field<Id>::displayId);
+        }
+    } else if constexpr (P == Pass::MessageView) {
+        noteStatus<P>(st, rq);
+    } else {
+        if constexpr (f.keyForm == KeyForm::Octet)
+            return markOctetKey(rq, static_cast<uint32_t>(f.keyEntry), st->field.value);
+        else if constexpr (f.keyForm == KeyForm::Word)
+            return markWordKey(rq, static_cast<uint32_t>(f.keyEntry), st->field.value);
+        else if constexpr (f.keyForm == KeyForm::Variable)
+            return markVariableKey(rq, static_cast<uint32_t>(f.keyEntry), &st->field);
+        else
+            (void)st, (void)rq;
+    }
+    return 1;
+}
+
+// Steps 6 to 8: spans reported, field id, consume `width` bits, report.
+template <Pass P, uint32_t Id>
+inline int finishField(DecodeState *st, Request<P> *rq, uint32_t width) {
+    st->field.spansReported = st->field.spansFilled;
+    st->field.fieldId = Id;
+    consume(st, width);
+    return report<P, Id>(st, rq);
+}
+
+// ---- Common field shapes ---------------------------------------------------
+
+// A field of `width` bits (1..32) at `offset` bits after the cursor, one
+// span, consuming `consumed` bits.  The caller has made sure the bits are
+// in the window.
+template <Pass P, uint32_t Id>
+inline int bitsField(DecodeState *st, Request<P> *rq, uint32_t offset, uint32_t width,
+                     uint32_t consumed) {
+    beginField<Id>(st);
+    if (!ensureSpans(st, 0))
+        return 0;
+    st->field.value = setSpan(st, 0, offset, offset + width - 1);
+    return finishField<P, Id>(st, rq, consumed);
+}
+
+// A one-octet field (tag, fixed length octet, one-octet value).  Emitted
+// only while the element is present and the octet is in the window;
+// otherwise the element is marked absent.
+template <Pass P, uint32_t Id>
+inline int octetField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    if (ctx->present == 0)
+        return 1;
+    if (!room(st, 8)) {
+        ctx->present = 0;
+        return 1;
+    }
+    return bitsField<P, Id>(st, rq, 0, 8, 8);
+}
+
+// A tag field of the class-and-number form: two spans (bits 8-7 and bits
+// 5-1), value class * 32 + number, so [0] shows as 40 in either form.
+template <Pass P, uint32_t Id>
+inline int classNumberTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    if (ctx->present == 0)
+        return 1;
+    if (!room(st, 8)) {
+        ctx->present = 0;
+        return 1;
+    }
+    beginField<Id>(st);
+    if (!ensureSpans(st, 1))
+        return 0;
+    const uint32_t cls = setSpan(st, 0, 6, 7);
+    const uint32_t number = setSpan(st, 1, 0, 4);
+    st->field.value = cls * 32 + number;
+    return finishField<P, Id>(st, rq, 8);
+}
+
+// A two-octet tag field (tag numbers above 30): the 16 bits read as one
+// value, first octet in the low byte.
+template <Pass P, uint32_t Id>
+inline int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    if (ctx->present == 0)
+        return 1;
+    if (!room(st, 16)) {
+        ctx->present = 0;
+        return 1;
+    }
+    return bitsField<P, Id>(st, rq, 0, 16, 16);
+}
+
+// The general BER length field (short, long or indefinite form): one span
+// over all length octets, value to `lengthValue`.  A length whose octets
+// are not all in the window is treated like any field that does not fit.
+template <Pass P, uint32_t Id>
+inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    if (ctx->present == 0)
+        return 1;
+    const LengthPeek len = peekLength(st, 0);
+    if (!len.fits) {
+        st->testFlag = 0;
+        ctx->present = 0;
+        return 1;
+    }
+    beginField<Id>(st);
+    if (!ensureSpans(st, 0))
+        return 0;
+    setSpan(st, 0, 0, (len.bits > 32 ? 32 : len.bits) - 1);
+    st->field.spans[0].lastBit = st->bitCursor + len.bits - 1;
+    st->field.value = static_cast<uint32_t>(len.value);
+    st->field.lengthFieldStart = 0;
+    st->field.lengthFieldBits = len.bits;
+    Scratch &s = g_scratch<P>;
+    s.lengthValue = static_cast<uint32_t>(len.value);
+    s.lengthOctetCount = len.octetCount;
+    return finishField<P, Id>(st, rq, len.bits);
+}
+
+// A value of up to `maxOctets` octets (at most what the window holds) as
+// half-octet spans, high half first: value = value * 16 + half.
+template <Pass P, uint32_t Id>
+inline int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
+                          uint32_t maxOctets) {
+    if (ctx->present == 0)
+        return 1;
+    if (!room(st, 8)) {
+        ctx->present = 0;
+        return 1;
+    }
+    uint32_t n = st->remainingBits / 8;
+    if (n > maxOctets)
+        n = maxOctets;
+    beginField<Id>(st);
+    if (!ensureSpans(st, 2 * n - 1))
+        return 0;
+    uint32_t value = 0;
+    for (uint32_t i = 0; i < n; ++i) {
+        value = value * 16 + setSpan(st, 2 * i, 8 * i + 4, 8 * i + 7);
+        value = value * 16 + setSpan(st, 2 * i + 1, 8 * i, 8 * i + 3);
+    }
+    st->field.value = value;
+    return finishField<P, Id>(st, rq, 8 * n);
+}
+
+// A value of up to `maxOctets` octets, one span per octet, value = value *
+// 256 + octet.
+template <Pass P, uint32_t Id>
+inline int octetsField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
+                       uint32_t maxOctets) {
+    if (ctx->present == 0)
+        return 1;
+    if (!room(st, 8)) {
+        ctx->present = 0;
+        return 1;
+    }
+    uint32_t n = st->remainingBits / 8;
+    if (n > maxOctets)
+        n = maxOctets;
+    beginField<Id>(st);
+    if (!ensureSpans(st, n - 1))
+        return 0;
+    uint32_t value = 0;
+    for (uint32_t i = 0; i < n; ++i)
+        value = value * 256 + setSpan(st, i, 8 * i, 8 * i + 7);
+    st->field.value = value;
+    return finishField<P, Id>(st, rq, 8 * n);
+}
+
+} // namespace camel
