@@ -1,0 +1,70 @@
+# Set-up, build and test entry points (see README.md, "Build and set-up").
+#
+#   make deps    install the Debian packages the build needs (root or sudo)
+#   make build   configure and build the native preset (build/native)
+#   make demo    deps + build, then decode the bundled sample messages
+#   make test    deps, then build and test the native, asan and m32 presets
+#   make bench   build, then run the benchmarks
+#   make clean   remove build/
+
+SHELL := /bin/bash
+.DEFAULT_GOAL := build
+
+PRESETS := native asan m32
+DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
+                libbenchmark-dev nlohmann-json3-dev libcli11-dev tshark python3
+SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
+
+SAMPLES := $(sort $(wildcard samples/*.txt))
+DEMO_ARGS ?= $(SAMPLES)
+
+.PHONY: deps build demo test bench clean $(addprefix test-,$(PRESETS))
+
+deps:
+	@missing=""; \
+	for pkg in $(DEB_PACKAGES); do \
+	    dpkg -s "$$pkg" 2>/dev/null | grep -q '^Status: install ok installed' \
+	        || missing="$$missing $$pkg"; \
+	done; \
+	if [ -n "$$missing" ]; then \
+	    echo "make deps: installing$$missing"; \
+	    echo "wireshark-common wireshark-common/install-setuid boolean false" \
+	        | $(SUDO) debconf-set-selections; \
+	    $(SUDO) apt-get update -qq; \
+	    $(SUDO) env DEBIAN_FRONTEND=noninteractive \
+	        apt-get install -y -qq --no-install-recommends $$missing; \
+	fi
+
+build:
+	cmake --preset native
+	cmake --build --preset native
+
+demo: deps build
+	@if [ -z "$(strip $(DEMO_ARGS))" ]; then \
+	    echo "make demo: no sample messages in samples/" >&2; exit 1; \
+	fi
+	build/native/dpx-decode $(DEMO_ARGS)
+
+# Each preset is configured, built and tested in turn; the first failure stops.
+test: deps
+	@for preset in $(PRESETS); do \
+	    echo "==== $$preset ===="; \
+	    cmake --preset "$$preset" \
+	        && cmake --build --preset "$$preset" \
+	        && ctest --preset "$$preset" \
+	        || { echo "make test: $$preset FAILED" >&2; exit 1; }; \
+	done; \
+	echo "make test: $(PRESETS) passed"
+
+$(addprefix test-,$(PRESETS)): test-%:
+	cmake --preset $*
+	cmake --build --preset $*
+	ctest --preset $*
+
+bench: build
+	@test -x build/native/camel_bench \
+	    || { echo "make bench: camel_bench not built (bench/ or Google Benchmark missing)" >&2; exit 1; }
+	build/native/camel_bench
+
+clean:
+	rm -rf build
