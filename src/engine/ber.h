@@ -64,16 +64,12 @@ inline void mandatoryMissing(DecodeState *st) { st->errorFlags |= DPX_ERR_MANDAT
 // An element longer than the window sets the length-beyond flag, keeps the
 // enclosing window and reports `overflow`; the caller then clears the
 // present flag of its context so that the construct's later members are
-// skipped.  A length whose octets are not in the window leaves the window
-// as it is: the length field itself will not fit.  0 when a stack cannot
-// grow.
+// skipped.  A header whose length octets run past the window counts as such
+// an element too (its length field will then not fit).  0 when a stack
+// cannot grow.
 inline int openElementWindow(DecodeState *st, uint32_t idBits, bool *overflow) {
-    *overflow = false;
     const LengthPeek len = peekLength(st, idBits);
-    if (len.fits) {
-        const uint64_t total = idBits + len.bits + len.value * 8;
-        *overflow = !narrowWindow(st, total);
-    }
+    *overflow = !narrowWindow(st, len.fits ? idBits + len.bits + len.value * 8 : ~0ull);
     return pushEnd(st);
 }
 

@@ -1,0 +1,296 @@
+#include "support/harness.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <stdexcept>
+
+namespace camel::test {
+
+Bytes hexBytes(std::string_view hex) {
+    Bytes out;
+    int high = -1;
+    for (char c : hex) {
+        int v;
+        if (c >= '0' && c <= '9')
+            v = c - '0';
+        else if (c >= 'a' && c <= 'f')
+            v = c - 'a' + 10;
+        else if (c >= 'A' && c <= 'F')
+            v = c - 'A' + 10;
+        else if (c == ' ' || c == ':' || c == '\n')
+            continue;
+        else
+            throw std::invalid_argument("bad hex digit");
+        if (high < 0) {
+            high = v;
+        } else {
+            out.push_back(static_cast<uint8_t>(high * 16 + v));
+            high = -1;
+        }
+    }
+    if (high >= 0)
+        throw std::invalid_argument("odd number of hex digits");
+    return out;
+}
+
+std::vector<std::string> Decoded::texts() const {
+    std::vector<std::string> out;
+    for (const Field &f : fields)
+        out.push_back(f.text);
+    return out;
+}
+
+const Field *Decoded::find(uint32_t id) const {
+    for (const Field &f : fields)
+        if (f.id == id)
+            return &f;
+    return nullptr;
+}
+
+const Key *Decoded::key(uint32_t index) const {
+    for (const Key &k : keyEntries)
+        if (k.index == index)
+            return &k;
+    return nullptr;
+}
+
+std::string textDump(const Decoded &d) {
+    std::string out;
+    for (const Field &f : d.fields) {
+        out += f.text;
+        out += '\n';
+    }
+    return out;
+}
+
+KeyShape keyShape(uint32_t entry) {
+    switch (entry) {
+    case 10: case 12: case 15: case 17: case 21: case 26: case 29:
+        return KeyShape::Variable;
+    case 18: case 20:
+        return KeyShape::Word;
+    default:
+        return KeyShape::Octet;
+    }
+}
+
+namespace {
+
+constexpr size_t kKeyBufferSize = 4096;
+
+PassEnd endOf(int result, const DecodeState *st) {
+    return PassEnd{result, st->remainingBits, st->errorFlags, st->bitCursor};
+}
+
+std::vector<Key> readKeys(const Bytes &buffer) {
+    std::vector<Key> keys;
+    for (uint32_t i = 0; i < DPX_KEY_ENTRY_COUNT; ++i) {
+        if ((buffer[i / 8] & (1u << (i % 8))) == 0)
+            continue;
+        const uint8_t *slot = buffer.data() + HOST_KEY_SLOT_BASE + HOST_KEY_SLOT_SIZE * i;
+        Key k{i, {}, 0, false};
+        switch (keyShape(i)) {
+        case KeyShape::Octet:
+            k.value = {slot[0]};
+            k.bits = 8;
+            break;
+        case KeyShape::Word:
+            k.value = {slot[0], slot[1]};
+            k.bits = 16;
+            break;
+        case KeyShape::Variable: {
+            const uint32_t bits = slot[0] | (slot[1] << 8);
+            const uint32_t offset = slot[2] | (slot[3] << 8);
+            k.bits = bits;
+            k.overflow = (offset & DPX_KEY_OVERFLOW_BIT) != 0;
+            if (!k.overflow && offset + (bits + 7) / 8 <= buffer.size())
+                k.value.assign(buffer.begin() + offset, buffer.begin() + offset + (bits + 7) / 8);
+            break;
+        }
+        }
+        keys.push_back(std::move(k));
+    }
+    return keys;
+}
+
+struct State {
+    DecodeState *st;
+    explicit State(const Bytes &m)
+        : st(host_NewState(m.data(), static_cast<uint32_t>(m.size()))) {}
+    ~State() { host_FreeState(st); }
+    State(const State &) = delete;
+    State &operator=(const State &) = delete;
+};
+
+struct PreRequest {
+    PreDecodeRequest rq{};
+    PreRequest(DecodeState *st, uint32_t layerLimit = 4) {
+        host_InitRequest(&rq, st, 4, layerLimit);
+        rq.layerCode = 0x5A;
+        rq.layerTag = 0x1234;
+    }
+    ~PreRequest() { host_FreeRequest(&rq); }
+    PreRequest(const PreRequest &) = delete;
+    PreRequest &operator=(const PreRequest &) = delete;
+};
+
+} // namespace
+
+KeyRun runKeys(const Bytes &message, uint16_t room) {
+    State s(message);
+    KeyRun run{0, {}, Bytes(kKeyBufferSize, 0), 0, {}};
+    KeyFieldRequest rq{};
+    rq.keyBuffer = run.buffer.data();
+    rq.dataOffset = HOST_KEY_DATA_START;
+    rq.valueRoom = room;
+    rq.state = s.st;
+    run.result = KFE_3gpp_camel_400(&rq);
+    run.end = endOf(run.result, s.st);
+    run.dataOffset = rq.dataOffset;
+    run.entries = readKeys(run.buffer);
+    return run;
+}
+
+Decoded decode(const Bytes &message) {
+    Decoded d;
+    host_ClearRecords();
+    {
+        State s(message);
+        PreRequest r(s.st);
+        d.md = endOf(dpx_PreDecodeMD(&r.rq), s.st);
+        d.layer = r.rq.layerEntries[0];
+        EXPECT_EQ(r.rq.remainingBits, s.st->remainingBits);
+        for (uint32_t i = 0; i < host_DecodedCount(); ++i) {
+            const HostDecodedField *f = host_Decoded(i);
+            Field field{f->fieldId, f->label, f->text, f->selector, {}};
+            for (uint32_t k = 0; k < f->spanCount; ++k)
+                field.spans.push_back({f->spans[k].firstBit, f->spans[k].lastBit, f->spans[k].value});
+            EXPECT_EQ(f->arg8, 0u);
+            EXPECT_EQ(f->arg9, 0u);
+            EXPECT_EQ(f->lineLayerCode, 0x5A);
+            d.fields.push_back(std::move(field));
+        }
+    }
+    host_ClearRecords();
+    {
+        State s(message);
+        PreRequest r(s.st);
+        d.display = endOf(dpx_PreDecodeTO(&r.rq), s.st);
+        for (uint32_t i = 0; i < host_DisplayCount(); ++i)
+            d.shown.push_back({host_Display(i)->displayId, host_Display(i)->text});
+    }
+    host_ClearRecords();
+    {
+        State s(message);
+        PreRequest r(s.st);
+        d.view = endOf(dpx_PreDecodeMV(&r.rq), s.st);
+        d.status = r.rq.status;
+        EXPECT_EQ(r.rq.layerIndex, 0u) << "the message-view pass fills no layer entry";
+    }
+    {
+        KeyRun k = runKeys(message, static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START));
+        d.keyEntries = std::move(k.entries);
+        d.keys = k.end;
+    }
+    host_ClearRecords();
+
+    // Cross-pass invariant.
+    for (const PassEnd *p : {&d.display, &d.view, &d.keys}) {
+        EXPECT_EQ(p->cursor, d.md.cursor);
+        EXPECT_EQ(p->remainingBits, d.md.remainingBits);
+        EXPECT_EQ(p->errorFlags, d.md.errorFlags);
+        EXPECT_EQ(p->result, d.md.result);
+    }
+    EXPECT_EQ(d.md.result, 1);
+    EXPECT_EQ(d.status, d.md.errorFlags != 0 ? DPX_STATUS_INVALID : 0);
+    EXPECT_EQ(d.shown.size(), d.fields.size());
+    for (size_t i = 0; i < d.fields.size() && i < d.shown.size(); ++i) {
+        const std::string &text = d.fields[i].text;
+        const std::string &value = d.shown[i].text;
+        EXPECT_TRUE(text.size() >= value.size() &&
+                    text.compare(text.size() - value.size(), value.size(), value) == 0)
+            << "display text '" << value << "' does not end the field text '" << text << "'";
+    }
+    return d;
+}
+
+namespace {
+
+// Shrinks a prepared state's growable arrays to one entry each, as a host
+// with minimal arrays would hand it over, so that a pass has to grow them.
+void shrinkArrays(DecodeState *st) {
+    st->posCapacity = 1;
+    st->endCapacity = 1;
+    st->field.spanCapacity = 1;
+    st->frameCapacity = 1;
+}
+
+uint32_t growthFlagOf(const DecodeState *st) {
+    uint32_t flag = 0;
+    if (st->posStack == nullptr || st->endStack == nullptr)
+        flag |= DPX_ERR_STACK_GROWTH;
+    if (st->field.spans == nullptr)
+        flag |= DPX_ERR_SPAN_GROWTH;
+    if (st->layerFrames == nullptr)
+        flag |= DPX_ERR_FRAME_GROWTH;
+    return flag;
+}
+
+enum class Which { MD, TO, MV, KF };
+
+// Runs one pass with pu_Realloc failing at call n; returns whether the
+// failure was reached.
+bool runFailing(const Bytes &message, Which which, uint32_t n) {
+    State s(message);
+    shrinkArrays(s.st);
+    PreRequest r(s.st);
+    Bytes keyBuffer(kKeyBufferSize, 0);
+    KeyFieldRequest kr{};
+    kr.keyBuffer = keyBuffer.data();
+    kr.dataOffset = HOST_KEY_DATA_START;
+    kr.valueRoom = static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START);
+    kr.state = s.st;
+    host_SetReallocFailAt(n);
+    int result = 0;
+    switch (which) {
+    case Which::MD: result = dpx_PreDecodeMD(&r.rq); break;
+    case Which::TO: result = dpx_PreDecodeTO(&r.rq); break;
+    case Which::MV: result = dpx_PreDecodeMV(&r.rq); break;
+    case Which::KF: result = KFE_3gpp_camel_400(&kr); break;
+    }
+    const bool reached = host_ReallocCalls() >= n;
+    host_SetReallocFailAt(0);
+    host_ClearRecords();
+    const uint32_t nulled = growthFlagOf(s.st);
+    if (reached) {
+        EXPECT_EQ(result, 0) << "pass " << int(which) << " failing at realloc " << n;
+        EXPECT_NE(nulled, 0u);
+        EXPECT_EQ(s.st->errorFlags & 0x70000000u, nulled);
+        if (which == Which::MD || which == Which::TO) {
+            EXPECT_EQ(r.rq.layerIndex, 0u);
+            EXPECT_EQ(r.rq.layerEntries[0].lastBit, 0u);
+            EXPECT_EQ(r.rq.remainingBits, 0u);
+        }
+    } else {
+        EXPECT_EQ(result, 1);
+        EXPECT_EQ(nulled, 0u);
+    }
+    return reached;
+}
+
+} // namespace
+
+uint32_t checkReallocFailures(const Bytes &message) {
+    uint32_t points = 0;
+    for (Which w : {Which::MD, Which::TO, Which::MV, Which::KF}) {
+        for (uint32_t n = 1;; ++n) {
+            if (!runFailing(message, w, n))
+                break;
+            ++points;
+        }
+    }
+    return points;
+}
+
+} // namespace camel::test

@@ -1,0 +1,103 @@
+// Test harness: runs the four passes over one message through the real
+// entry points, with the stand-in host recording what a host would see.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "dpx_camel.h"
+#include "dpx_standin_host.h"
+
+namespace camel::test {
+
+using Bytes = std::vector<uint8_t>;
+
+// Hex digits to bytes; blanks and colons are ignored.
+Bytes hexBytes(std::string_view hex);
+
+struct Span {
+    uint32_t first, last, value;
+    bool operator==(const Span &) const = default;
+};
+
+// One field as the decoded-field pass reported it.
+struct Field {
+    uint32_t id;
+    std::string label;
+    std::string text;
+    uint32_t selector;
+    std::vector<Span> spans;
+};
+
+// One field as the display pass reported it.
+struct Shown {
+    uint32_t displayId;
+    std::string text;
+};
+
+// One key entry found present in the key buffer.
+struct Key {
+    uint32_t index;
+    Bytes value;       // as stored: 1 byte, 2 bytes, or the packed bytes
+    uint32_t bits;     // 8, 16, or the slot's bit length
+    bool overflow;
+};
+
+// How a pass ended.
+struct PassEnd {
+    int result = -1;
+    uint32_t remainingBits = 0;
+    uint32_t errorFlags = 0;
+    uint32_t cursor = 0;
+};
+
+struct Decoded {
+    PassEnd md, display, view, keys;
+    std::vector<Field> fields;
+    std::vector<Shown> shown;
+    int32_t status = 0;         // the message-view pass's request status
+    LayerInfoEntry layer{};     // the decoded-field pass's layer entry
+    std::vector<Key> keyEntries;
+
+    // The decoded-field texts in order, for compact assertions.
+    std::vector<std::string> texts() const;
+    const Field *find(uint32_t id) const; // first field with this id
+    const Key *key(uint32_t index) const;
+};
+
+// Runs all four passes (each on a freshly prepared state) and checks the
+// cross-pass invariant: the same cursor, remaining bits and error flags at
+// the end of every pass, the display pass reporting the same fields in the
+// same order as the decoded-field pass, the message-view status matching
+// the flags.  Failures are reported through gtest.
+Decoded decode(const Bytes &message);
+inline Decoded decode(std::string_view hex) { return decode(hexBytes(hex)); }
+
+// Runs the key-field pass only, with a given key room; the key buffer is
+// returned so a test can look at the raw bytes.
+struct KeyRun {
+    int32_t result;
+    PassEnd end;
+    Bytes buffer;
+    uint16_t dataOffset;
+    std::vector<Key> entries;
+};
+KeyRun runKeys(const Bytes &message, uint16_t room);
+
+// Makes pu_Realloc fail at every call a pass reaches on this message (the
+// state's arrays start at capacity 1 so that growth happens) and checks,
+// for every pass and every n, that the pass returns 0 with the flag of the
+// array that failed, writes no layer entry end and does not advance the
+// layer index.  Returns the number of failure points exercised.
+uint32_t checkReallocFailures(const Bytes &message);
+
+// The decoded-field texts of a message joined by newlines.
+std::string textDump(const Decoded &d);
+
+// The entry's key form in the stand-in key layout.
+enum class KeyShape { Octet, Word, Variable };
+KeyShape keyShape(uint32_t entry);
+
+} // namespace camel::test

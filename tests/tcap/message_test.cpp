@@ -1,0 +1,168 @@
+// Message level through the real entry points: types, windows, transaction
+// ids, P-Abort cause, and the flags of malformed messages.
+#include <gtest/gtest.h>
+
+#include "support/harness.h"
+
+using camel::test::Bytes;
+using camel::test::decode;
+using camel::test::Span;
+using Texts = std::vector<std::string>;
+
+namespace {
+
+TEST(Message, BeginWithFourOctetTransactionId) {
+    const auto d = decode("62 06 48 04 01 02 03 04");
+    EXPECT_EQ(d.texts(), (Texts{"MT=Begin", "LENGTH=6 octet(s)", "Originating Trans Id Tag=48",
+                                "LENGTH=4 octet(s)", "  Originating Transaction Id=01020304"}));
+    ASSERT_EQ(d.fields.size(), 5u);
+    EXPECT_EQ(d.fields[0].id, 3604u);
+    EXPECT_EQ(d.fields[0].label, "MT");
+    EXPECT_EQ(d.fields[0].selector, 0u);
+    EXPECT_EQ(d.fields[0].spans, (std::vector<Span>{{1, 8, 0x62}}));
+    EXPECT_EQ(d.fields[1].id, 3608u);
+    EXPECT_EQ(d.fields[1].spans, (std::vector<Span>{{9, 16, 6}}));
+    EXPECT_EQ(d.fields[2].id, 3651u);
+    EXPECT_EQ(d.fields[3].id, 3652u);
+    const auto &tid = d.fields[4];
+    EXPECT_EQ(tid.id, 3653u);
+    EXPECT_EQ(tid.label, "Originating Transaction Id");
+    EXPECT_EQ(tid.selector, 1u);
+    // High nibble before low nibble of each octet.
+    EXPECT_EQ(tid.spans, (std::vector<Span>{{37, 40, 0}, {33, 36, 1}, {45, 48, 0}, {41, 44, 2},
+                                            {53, 56, 0}, {49, 52, 3}, {61, 64, 0}, {57, 60, 4}}));
+    EXPECT_EQ(d.md.errorFlags, 0u);
+    EXPECT_EQ(d.md.remainingBits, 0u);
+    EXPECT_EQ(d.layer.firstBit, 1u);
+    EXPECT_EQ(d.layer.lastBit, 64u);
+    EXPECT_EQ(d.layer.layerTag, 0x1234u);
+    EXPECT_EQ(d.layer.layerCode, 0x5Au);
+
+    ASSERT_EQ(d.shown.size(), 5u);
+    EXPECT_EQ(d.shown[0].text, "Begin");
+    EXPECT_EQ(d.shown[0].displayId, 3604u);
+    EXPECT_EQ(d.shown[1].displayId, 3606u); // every "LENGTH" shares 3606
+    EXPECT_EQ(d.shown[1].text, "6 octet(s)");
+    EXPECT_EQ(d.shown[2].displayId, 3651u);
+    EXPECT_EQ(d.shown[3].displayId, 3606u);
+    EXPECT_EQ(d.shown[4].displayId, 3653u);
+    EXPECT_EQ(d.shown[4].text, "01020304");
+
+    ASSERT_NE(d.key(0), nullptr);
+    EXPECT_EQ(d.key(0)->value, Bytes{0x62});
+    ASSERT_NE(d.key(26), nullptr);
+    EXPECT_EQ(d.key(26)->value, (Bytes{1, 2, 3, 4}));
+    EXPECT_EQ(d.key(26)->bits, 32u);
+}
+
+TEST(Message, AsymmetricTransactionIdNibbles) {
+    const auto d = decode("62 06 48 04 0A 1B 2C 3D");
+    EXPECT_EQ(d.fields.back().text, "  Originating Transaction Id=0a1b2c3d");
+    EXPECT_EQ(d.key(26)->value, (Bytes{0x0A, 0x1B, 0x2C, 0x3D}));
+}
+
+TEST(Message, TransactionIdLongerThanFourOctets) {
+    const auto d = decode("62 07 48 05 01 02 03 04 05");
+    EXPECT_EQ(d.fields.back().text, "  Originating Transaction Id=01020304");
+    EXPECT_EQ(d.md.errorFlags, DPX_ERR_LEFTOVER);
+    EXPECT_EQ(d.status, DPX_STATUS_INVALID);
+    EXPECT_EQ(d.md.cursor, 73u);
+}
+
+TEST(Message, ContinueWithoutOriginatingIdStillDecodesDestination) {
+    const auto d = decode("65 03 49 01 07");
+    EXPECT_EQ(d.texts(), (Texts{"MT=Continue", "LENGTH=3 octet(s)", "Destination Trans Id Tag=49",
+                                "LENGTH=1 octet(s)", "  Destination Transaction Id=07"}));
+    EXPECT_EQ(d.md.errorFlags, DPX_ERR_MANDATORY_MISSING);
+    EXPECT_EQ(d.fields[1].id, 3612u);
+    EXPECT_EQ(d.key(29)->value, Bytes{0x07});
+    EXPECT_EQ(d.key(26), nullptr);
+}
+
+TEST(Message, AbortWithPAbortCause) {
+    const auto d = decode("67 09 49 04 aa bb cc dd 4a 01 01");
+    EXPECT_EQ(d.texts(),
+              (Texts{"MT=Abort", "LENGTH=9 octet(s)", "Destination Trans Id Tag=49",
+                     "LENGTH=4 octet(s)", "  Destination Transaction Id=aabbccdd",
+                     "P-Abort Cause Tag=4a", "  Length=1 octet(s)",
+                     "  P-Abort Cause=Unrecognized Transaction ID"}));
+    EXPECT_EQ(d.fields[5].id, 3657u);
+    EXPECT_EQ(d.fields[6].id, 3658u);
+    EXPECT_EQ(d.shown[6].displayId, 3718u); // "  Length" is shown under 3718
+    EXPECT_EQ(d.fields[7].id, 3659u);
+    EXPECT_EQ(d.shown[7].text, "Unrecognized Transaction ID");
+    EXPECT_EQ(d.md.errorFlags, 0u);
+    EXPECT_EQ(d.key(0)->value, Bytes{0x67});
+    EXPECT_EQ(d.key(29)->value, (Bytes{0xAA, 0xBB, 0xCC, 0xDD}));
+    EXPECT_EQ(d.key(3)->value, Bytes{0x01});
+}
+
+TEST(Message, UnknownTypeReportsOnlyTheTypeWithEmptyName) {
+    const auto d = decode("63");
+    EXPECT_EQ(d.texts(), Texts{"MT="});
+    EXPECT_EQ(d.shown[0].text, "");
+    EXPECT_EQ(d.md.errorFlags, 0u);
+    EXPECT_EQ(d.md.remainingBits, 0u);
+    EXPECT_EQ(d.key(0)->value, Bytes{0x63});
+}
+
+TEST(Message, EmptyMessageReportsNothing) {
+    const auto d = decode("");
+    EXPECT_TRUE(d.fields.empty());
+    EXPECT_EQ(d.md.errorFlags, 0u);
+    EXPECT_EQ(d.layer.lastBit, 0u);
+}
+
+TEST(Message, UnidirectionalWithoutComponentPortion) {
+    const auto d = decode("61 00");
+    EXPECT_EQ(d.md.errorFlags, DPX_ERR_MANDATORY_MISSING);
+    EXPECT_EQ(d.fields[1].id, 3606u);
+}
+
+// Malformed lengths: flags, and nothing read beyond the message (the
+// harness's state holds an exact copy of the bytes, so ASan would see it).
+TEST(Message, MalformedLengths) {
+    struct Case {
+        const char *hex;
+        uint32_t flags;
+        size_t fields;
+    } cases[] = {
+        {"62", DPX_ERR_LENGTH_BEYOND, 1},                 // type octet only
+        {"62 81", DPX_ERR_LENGTH_BEYOND | DPX_ERR_LEFTOVER, 1}, // long form cut
+        {"62 84 ff ff ff f0 48", DPX_ERR_LENGTH_BEYOND, 3},
+        {"62 10 48 04 01 02 03 04", DPX_ERR_LENGTH_BEYOND, 5},  // message longer than data
+        {"62 06 48 09 01 02 03 04", DPX_ERR_LENGTH_BEYOND, 5},  // tid longer than window
+        {"62 02 48 85", DPX_ERR_LENGTH_BEYOND | DPX_ERR_LEFTOVER, 3}, // tid length cut
+        {"62 89 00 00 00 00 00 00 00 00 06 48 04 01 02 03 04", 0, 5}, // non-minimal length
+        {"67 06 49 01 01 4a 05 01", DPX_ERR_LENGTH_BEYOND, 8},
+        {"62 08 48 04 01 02 03 04 00 00", DPX_ERR_LEFTOVER, 5},
+    };
+    for (const Case &c : cases) {
+        SCOPED_TRACE(c.hex);
+        const auto d = decode(c.hex);
+        EXPECT_EQ(d.md.errorFlags, c.flags) << camel::test::textDump(d);
+        EXPECT_EQ(d.fields.size(), c.fields) << camel::test::textDump(d);
+        EXPECT_EQ(d.md.remainingBits, 0u);
+    }
+}
+
+TEST(Message, LongFormLengthsShowOneSpanOverAllOctets) {
+    Bytes m = {0x62, 0x81, 0x06, 0x48, 0x04, 1, 2, 3, 4};
+    const auto d = decode(m);
+    ASSERT_GE(d.fields.size(), 2u);
+    EXPECT_EQ(d.fields[1].text, "LENGTH=6 octet(s)");
+    EXPECT_EQ(d.fields[1].spans.size(), 1u);
+    EXPECT_EQ(d.fields[1].spans[0].first, 9u);
+    EXPECT_EQ(d.fields[1].spans[0].last, 24u);
+    EXPECT_EQ(d.md.errorFlags, 0u);
+}
+
+TEST(Message, ReallocFailuresAreReportedAtEveryPoint) {
+    for (const char *hex : {"62 06 48 04 01 02 03 04", "67 09 49 04 aa bb cc dd 4a 01 01",
+                            "65 06 48 01 01 49 01 02"}) {
+        SCOPED_TRACE(hex);
+        EXPECT_GT(camel::test::checkReallocFailures(camel::test::hexBytes(hex)), 4u);
+    }
+}
+
+} // namespace
