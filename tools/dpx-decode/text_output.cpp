@@ -1,0 +1,118 @@
+#include <ostream>
+
+#include "output.h"
+
+namespace dpxdecode {
+namespace {
+
+struct FlagName {
+    uint32_t bit;
+    const char *name;
+};
+
+constexpr FlagName kFlagNames[] = {
+    {DPX_ERR_MANDATORY_MISSING, "mandatory element missing"},
+    {DPX_ERR_LENGTH_BEYOND, "length beyond window"},
+    {DPX_ERR_LEFTOVER, "left-over bits skipped"},
+    {DPX_ERR_FRAME_GROWTH, "layer frame growth failed"},
+    {DPX_ERR_STACK_GROWTH, "stack growth failed"},
+    {DPX_ERR_SPAN_GROWTH, "span growth failed"},
+};
+
+std::string hex32(uint32_t v) {
+    static const char digits[] = "0123456789abcdef";
+    std::string s;
+    do {
+        s.insert(s.begin(), digits[v & 0xF]);
+        v >>= 4;
+    } while (v != 0);
+    return "0x" + s;
+}
+
+// A pass that did not finish says so on its own line.
+void writeFailure(std::ostream &os, const char *pass, const PassOutcome &p) {
+    if (p.result == 1)
+        return;
+    os << pass << ": pass failed (result " << p.result;
+    if (p.errorFlags != 0)
+        os << ": " << describeErrorFlags(p.errorFlags);
+    os << ")\n";
+}
+
+void writeVerdict(std::ostream &os, const ViewOut &v) {
+    const bool valid = v.result == 1 && v.errorFlags == 0 && v.status == 0;
+    os << "view: " << (valid ? "valid" : "invalid");
+    if (v.errorFlags != 0)
+        os << ": " << describeErrorFlags(v.errorFlags);
+    // The status goes with the flags: -52 exactly when a flag is set.
+    if ((v.status == DPX_STATUS_INVALID) != (v.errorFlags != 0))
+        os << " (status " << v.status << ')';
+    os << '\n';
+}
+
+void writeKeys(std::ostream &os, const KeysOut &k) {
+    if (k.entries.empty()) {
+        os << "keys: none\n";
+        return;
+    }
+    for (const KeyEntryOut &e : k.entries) {
+        os << "key " << e.index << ' ' << keyEntryName(e.index) << ": ";
+        if (e.overflow)
+            os << "overflow";
+        else
+            os << e.value;
+        if (keyEntryForm(e.index) == KeyForm::Variable && !e.overflow)
+            os << " (" << e.bits << " bits)";
+        os << '\n';
+    }
+}
+
+} // namespace
+
+std::string describeErrorFlags(uint32_t flags) {
+    std::string s;
+    auto add = [&s](const std::string &part) {
+        if (!s.empty())
+            s += ", ";
+        s += part;
+    };
+    for (const FlagName &f : kFlagNames) {
+        if (flags & f.bit) {
+            add(f.name);
+            flags &= ~f.bit;
+        }
+    }
+    if (flags != 0)
+        add(hex32(flags));
+    return s;
+}
+
+void writeText(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r,
+               const TextOptions &options) {
+    os << "message " << index << ": " << hex << '\n';
+    if (r.md) {
+        for (const DecodedOut &f : r.md->fields) {
+            os << f.text;
+            if (options.spans) {
+                os << ' ';
+                for (const SpanOut &s : f.spans)
+                    os << " [" << s.first << '-' << s.last << "]=" << s.value;
+            }
+            os << '\n';
+        }
+        writeFailure(os, "md", *r.md);
+    }
+    if (r.display) {
+        os << "display: " << r.display->fields.size() << " values\n";
+        writeFailure(os, "display", *r.display);
+    }
+    if (r.view)
+        writeVerdict(os, *r.view);
+    if (r.keys) {
+        writeKeys(os, *r.keys);
+        writeFailure(os, "keys", *r.keys);
+    }
+    os << '\n';
+}
+
+} // namespace dpxdecode
