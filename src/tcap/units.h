@@ -26,4 +26,9 @@ int decodeUniExternal(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Requ
 template <Pass P>
 int decodeComponentPortion(DecodeState *st, ElementContext *ctx, Request<P> *rq);
 
+// The identifier octet of an operation code, shown and consumed whatever it
+// is; the first step of the operation dispatcher and of the result decoder.
+template <Pass P>
+int decodeOperationCodeTag(DecodeState *st, ElementContext *ctx, Request<P> *rq);
+
 } // namespace camel
