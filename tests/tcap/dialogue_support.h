@@ -1,0 +1,74 @@
+// Small BER builder for dialogue-portion tests: messages are assembled from
+// named parts so that each test shows only what it varies.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "support/harness.h"
+
+namespace camel::test::dlg {
+
+inline Bytes cat(std::initializer_list<Bytes> parts) {
+    Bytes out;
+    for (const Bytes &p : parts)
+        out.insert(out.end(), p.begin(), p.end());
+    return out;
+}
+
+// Definite length, short or long form.
+inline Bytes tlv(uint8_t tag, const Bytes &content) {
+    Bytes out{tag};
+    const size_t n = content.size();
+    if (n < 0x80) {
+        out.push_back(static_cast<uint8_t>(n));
+    } else if (n < 0x100) {
+        out.insert(out.end(), {0x81, static_cast<uint8_t>(n)});
+    } else {
+        out.insert(out.end(), {0x82, static_cast<uint8_t>(n >> 8), static_cast<uint8_t>(n)});
+    }
+    return cat({out, content});
+}
+
+// Indefinite length closed by 00 00.
+inline Bytes indef(uint8_t tag, const Bytes &content) {
+    return cat({Bytes{tag, 0x80}, content, Bytes{0, 0}});
+}
+
+inline const Bytes kDialogueAs = hexBytes("06 07 00 11 86 05 01 01 01");
+inline const Bytes kUniDialogueAs = hexBytes("06 07 00 11 86 05 01 02 01");
+inline const Bytes kProtocolVersion = hexBytes("80 02 07 80");
+
+// Application context name A1 around an OBJECT IDENTIFIER of the given arcs.
+inline Bytes acn(const char *arcs) { return tlv(0xA1, tlv(0x06, hexBytes(arcs))); }
+inline Bytes cap2() { return acn("04 00 00 01 00 32 01"); }
+
+// 6B { 28 { dialogue-as, A0 { pdu } } }, all definite.
+inline Bytes structured(const Bytes &pdu) {
+    return tlv(0x6B, tlv(0x28, cat({kDialogueAs, tlv(0xA0, pdu)})));
+}
+
+inline Bytes begin(const Bytes &portions) {
+    return tlv(0x62, cat({hexBytes("48 04 01 02 03 04"), portions}));
+}
+
+// The decoded-field texts from the first field with `id` on.
+inline std::vector<std::string> textsFrom(const Decoded &d, uint32_t id) {
+    std::vector<std::string> out;
+    bool on = false;
+    for (const Field &f : d.fields) {
+        on = on || f.id == id;
+        if (on)
+            out.push_back(f.text);
+    }
+    return out;
+}
+
+inline size_t countId(const Decoded &d, uint32_t id) {
+    size_t n = 0;
+    for (const Field &f : d.fields)
+        n += f.id == id ? 1 : 0;
+    return n;
+}
+
+} // namespace camel::test::dlg
