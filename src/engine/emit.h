@@ -106,12 +106,16 @@ inline void renderValue(const FieldDef &f, const FieldRecord &field, TextBuf &ou
     }
 }
 
+// 0 for a field of one span; for several: the field's own selector, 1 for
+// values shown span by span, else spans - 1 (integers built octet by octet).
 inline uint32_t spanSelector(const FieldDef &f, uint32_t spans) {
+    if (spans <= 1)
+        return 0;
     if (f.selector != 0xFF)
         return f.selector;
     if (f.render == Render::Digits)
         return 1;
-    return spans > 1 ? spans - 1 : 0;
+    return spans - 1;
 }
 
 } // namespace detail

@@ -72,21 +72,16 @@ int decodeUserInfoItem(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
 
 // The EXTERNALs of the user information, one after another while the next
 // identifier is 28, at most kMaxUserInfoItems; an empty list is no error.
-// Items are counted in the block's occurrence count.  In the
-// end-of-contents form every item is preceded by an end-of-contents check,
-// so the octets 00 00 after the last item close the user information.
+// Items are counted in the block's occurrence count.  Like every last
+// member of an end-of-contents block, the list leaves the octets 00 00 that
+// follow it to the enclosing block.
 template <Pass P>
 int decodeUserInfoElements(DecodeState *st, ElementContext *ctx, uint32_t inEoc,
                            Request<P> *rq) {
     if (!elementStart(st, "User Info Elements"))
         return 0;
-    while (ctx->present != 0 && ctx->occurrenceCount < kMaxUserInfoItems) {
-        if (inEoc != 0) {
-            if (!eocCheck<P>(st, ctx, rq))
-                return 0;
-            if (ctx->eocSeen != 0)
-                break;
-        }
+    while (ctx->present != 0 && ctx->occurrenceCount < kMaxUserInfoItems &&
+           (inEoc == 0 || ctx->eocSeen == 0)) {
         if (!tagTest(st, 0x28))
             break;
         ++ctx->occurrenceCount;
