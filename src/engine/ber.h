@@ -57,6 +57,17 @@ inline bool tagTest16(DecodeState *st, uint32_t expected) {
 // A mandatory element whose tag is missing.
 inline void mandatoryMissing(DecodeState *st) { st->errorFlags |= DPX_ERR_MANDATORY_MISSING; }
 
+// Whole-octet tag test of an element that must be there: a missing tag
+// sets the mandatory-missing flag.  Returns whether the tag is next.
+template <Pass P>
+inline bool mandatoryTag(DecodeState *st, Request<P> *rq, uint32_t tag) {
+    if (tagTest(st, tag))
+        return true;
+    mandatoryMissing(st);
+    noteStatus<P>(st, rq);
+    return false;
+}
+
 // ---- Element windows ---------------------------------------------------------
 
 // Narrows the window to the element at the cursor, whose identifier takes
@@ -82,6 +93,71 @@ inline void closeElementWindow(DecodeState *st, Request<P> *rq) {
     popPos(st);
     popEnd(st);
     noteStatus<P>(st, rq);
+}
+
+// ---- Element shapes ------------------------------------------------------------------
+
+// A run of fixed one-octet fields (tags, one-octet lengths, OBJECT
+// IDENTIFIER arcs, one-octet values): each taken while the element is
+// present and its octet is in the window, whatever the length octets say.
+template <Pass P, uint32_t... Ids>
+inline int octetFields(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    return ((octetField<P, Ids>(st, ctx, rq) != 0) && ...) ? 1 : 0;
+}
+
+// An element made of fixed one-octet fields, whose tag test has succeeded.
+template <Pass P, uint32_t... Ids>
+inline int octetFieldsElement(DecodeState *st, ElementContext *ctx, Request<P> *rq,
+                              const char *name) {
+    if (!elementStart(st, name) || !octetFields<P, Ids...>(st, ctx, rq))
+        return 0;
+    popPos(st);
+    noteStatus<P>(st, rq);
+    return 1;
+}
+
+// A pre-bounded element whose tag test has succeeded: its window is set
+// from its length before anything is shown.  An element longer than the
+// enclosing window is flagged, clears `ctx` (the construct's later members
+// are skipped) and is shown against what is there.  `contents` is called
+// with the element's own context, whose present flag is 1, at the
+// identifier octet.
+template <Pass P, class Contents>
+int preBoundedElement(DecodeState *st, ElementContext *ctx, Request<P> *rq, const char *name,
+                      uint32_t idBits, Contents &&contents) {
+    if (!elementStart(st, name))
+        return 0;
+    bool overflow = false;
+    if (!openElementWindow(st, idBits, &overflow))
+        return 0;
+    if (overflow)
+        ctx->present = 0;
+    ElementContext own{0, 1, 0, 0};
+    if (!contents(&own))
+        return 0;
+    closeElementWindow<P>(st, rq);
+    return 1;
+}
+
+// The explicit [n] wrappers (class-and-number tag test, [n] in either form):
+// tag field of two spans, length field, then `contents` with the wrapper's
+// own context.  Definite lengths only: with 80 as its length the window
+// holds the header alone.
+template <Pass P, uint32_t TagId, uint32_t LengthId, class Contents>
+int wrapperElement(DecodeState *st, ElementContext *ctx, Request<P> *rq, const char *name,
+                   uint32_t number, bool mandatory, Contents &&contents) {
+    if (ctx->present == 0)
+        return 1;
+    if (!tagTestClassNumber(st, 2 * 32 + number)) {
+        if (mandatory)
+            mandatoryMissing(st);
+        noteStatus<P>(st, rq);
+        return 1;
+    }
+    return preBoundedElement<P>(st, ctx, rq, name, 8, [&](ElementContext *own) {
+        return classNumberTagField<P, TagId>(st, own, rq) && lengthField<P, LengthId>(st, own, rq) &&
+               contents(own);
+    });
 }
 
 // ---- End of contents -----------------------------------------------------------

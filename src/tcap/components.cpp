@@ -34,21 +34,9 @@ int decodeIdElement(DecodeState *st, ElementContext *ctx, uint32_t inEoc, const 
                     Request<P> *rq) {
     if (ctx->present == 0 || (inEoc != 0 && ctx->eocSeen != 0))
         return 1;
-    if (!tagTest(st, Tag)) {
-        if constexpr (Mandatory) {
-            mandatoryMissing(st);
-            noteStatus<P>(st, rq);
-        }
+    if (Mandatory ? !mandatoryTag<P>(st, rq, Tag) : !tagTest(st, Tag))
         return 1;
-    }
-    if (!elementStart(st, name))
-        return 0;
-    if (!octetField<P, TagId>(st, ctx, rq) || !octetField<P, LengthId>(st, ctx, rq) ||
-        !octetField<P, ValueId>(st, ctx, rq))
-        return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return octetFieldsElement<P, TagId, LengthId, ValueId>(st, ctx, rq, name);
 }
 
 template <Pass P>
@@ -75,17 +63,6 @@ int decodeProblemIdentifier(DecodeState *st, ElementContext *ctx, uint32_t inEoc
     return 1;
 }
 
-template <Pass P, uint32_t LengthId, uint32_t CodeId>
-int decodeProblemFields(DecodeState *st, ElementContext *ctx, const char *name, Request<P> *rq) {
-    if (!elementStart(st, name))
-        return 0;
-    if (!octetField<P, LengthId>(st, ctx, rq) || !octetField<P, CodeId>(st, ctx, rq))
-        return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
-}
-
 // The problem the identifier selected: its length octet and its code, each
 // one octet.  An identifier outside 80 to 83 selects nothing.
 template <Pass P>
@@ -94,13 +71,13 @@ int decodeProblem(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Request<
         return 1;
     switch (g_scratch<P>.choiceTag) {
     case 0x80:
-        return decodeProblemFields<P, 3709, 3710>(st, ctx, "General Problem", rq);
+        return octetFieldsElement<P, 3709, 3710>(st, ctx, rq, "General Problem");
     case 0x81:
-        return decodeProblemFields<P, 3711, 3712>(st, ctx, "Invoke Problem", rq);
+        return octetFieldsElement<P, 3711, 3712>(st, ctx, rq, "Invoke Problem");
     case 0x82:
-        return decodeProblemFields<P, 3713, 3714>(st, ctx, "Return Result Problem", rq);
+        return octetFieldsElement<P, 3713, 3714>(st, ctx, rq, "Return Result Problem");
     case 0x83:
-        return decodeProblemFields<P, 3715, 3716>(st, ctx, "Return Error Problem", rq);
+        return octetFieldsElement<P, 3715, 3716>(st, ctx, rq, "Return Error Problem");
     default:
         return 1;
     }
@@ -256,13 +233,7 @@ template <Pass P>
 int decodeOperationCodeTag(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (ctx->present == 0)
         return 1;
-    if (!elementStart(st, "Operation Code Tag"))
-        return 0;
-    if (!octetField<P, 3876>(st, ctx, rq))
-        return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return octetFieldsElement<P, 3876>(st, ctx, rq, "Operation Code Tag");
 }
 
 CAMEL_INSTANTIATE_UNIT(decodeComponentPortion, DecodeState *, ElementContext *);

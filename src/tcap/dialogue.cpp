@@ -21,16 +21,9 @@ template <Pass P>
 int decodeResultInteger(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (ctx->present == 0)
         return 1;
-    if (!tagTest(st, 0x02)) {
-        mandatoryMissing(st);
-        noteStatus<P>(st, rq);
+    if (!mandatoryTag<P>(st, rq, 0x02))
         return 1;
-    }
-    if (!elementStart(st, "Integer") || !octetFields<P, 3772, 3773, 3774>(st, ctx, rq))
-        return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return octetFieldsElement<P, 3772, 3773, 3774>(st, ctx, rq, "Integer");
 }
 
 template <Pass P>
@@ -92,11 +85,7 @@ template <Pass P>
 int decodeAbortSource(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (ctx->present == 0 || !tagTest(st, 0x80))
         return 1;
-    if (!elementStart(st, "Abort Source") || !octetFields<P, 3783, 3784, 3785>(st, ctx, rq))
-        return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return octetFieldsElement<P, 3783, 3784, 3785>(st, ctx, rq, "Abort Source");
 }
 
 // ---- Structured dialogue -------------------------------------------------------
@@ -166,11 +155,8 @@ template <Pass P>
 int decodeExternal(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (ctx->present == 0)
         return 1;
-    if (!tagTest(st, 0x28)) {
-        mandatoryMissing(st);
-        noteStatus<P>(st, rq);
+    if (!mandatoryTag<P>(st, rq, 0x28))
         return 1;
-    }
     return delimitedConstruct<P, 3743, 3744>(
         st, ctx, rq, "External", "INLINE BLOCK",
         [&](ElementContext *c, uint32_t) {
@@ -192,11 +178,8 @@ template <Pass P>
 int decodeUnidirectionalDialogue(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (ctx->present == 0)
         return 1;
-    if (!tagTest(st, 0x60)) {
-        mandatoryMissing(st);
-        noteStatus<P>(st, rq);
+    if (!mandatoryTag<P>(st, rq, 0x60))
         return 1;
-    }
     return delimitedConstruct<P, 3728, 3729>(
         st, ctx, rq, "Unidirectional Dialogue", "INLINE BLOCK",
         [&](ElementContext *c, uint32_t inEoc) { return decodeProtocolVersion<P>(st, c, inEoc, rq); },
@@ -221,11 +204,8 @@ template <Pass P>
 int decodeUniExternal(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Request<P> *rq) {
     if (ctx->present == 0 || (inEoc != 0 && ctx->eocSeen != 0))
         return 1;
-    if (!tagTest(st, 0x28)) {
-        mandatoryMissing(st);
-        noteStatus<P>(st, rq);
+    if (!mandatoryTag<P>(st, rq, 0x28))
         return 1;
-    }
     return delimitedConstruct<P, 3622, 3623>(
         st, ctx, rq, "External", "INLINE BLOCK",
         [&](ElementContext *c, uint32_t) {

@@ -16,16 +16,9 @@ enum : uint32_t {
 // follow, else the identifier is flagged and ends.
 template <Pass P, uint32_t AcId, uint32_t ContextId>
 int decodeCap3Arcs(DecodeState *st, ElementContext *ctx, const char *name, Request<P> *rq) {
-    if (!tagTest(st, 0x03)) {
-        mandatoryMissing(st);
-        noteStatus<P>(st, rq);
+    if (!mandatoryTag<P>(st, rq, 0x03))
         return 1;
-    }
-    if (!elementStart(st, name) || !octetFields<P, AcId, ContextId>(st, ctx, rq))
-        return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return octetFieldsElement<P, AcId, ContextId>(st, ctx, rq, name);
 }
 
 // The application context's OBJECT IDENTIFIER (tag 06, mandatory): the
@@ -34,11 +27,8 @@ template <Pass P>
 int decodeAcObjectIdentifier(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (ctx->present == 0)
         return 1;
-    if (!tagTest(st, 0x06)) {
-        mandatoryMissing(st);
-        noteStatus<P>(st, rq);
+    if (!mandatoryTag<P>(st, rq, 0x06))
         return 1;
-    }
     if (!elementStart(st, "Object Identifier"))
         return 0;
     if (!octetFields<P, 3791, 3792, 3793, 3794, 3795, 3796>(st, ctx, rq) ||

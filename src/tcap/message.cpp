@@ -20,26 +20,14 @@ enum : uint32_t {
 template <Pass P, uint32_t Tag, uint32_t TagId, uint32_t LengthId, uint32_t ValueId>
 int decodeTransactionId(DecodeState *st, ElementContext *ctx, const char *name,
                         Request<P> *rq) {
-    if (ctx->present == 0)
+    if (ctx->present == 0 || !mandatoryTag<P>(st, rq, Tag))
         return 1;
-    if (!tagTest(st, Tag)) {
-        mandatoryMissing(st);
-        noteStatus<P>(st, rq);
-        return 1;
-    }
-    if (!elementStart(st, name))
-        return 0;
-    bool overflow = false;
-    if (!openElementWindow(st, 8, &overflow))
-        return 0;
-    if (overflow)
-        ctx->present = 0; // the message's later elements are not decoded
-    ElementContext own{0, 1, 0, 0};
-    if (!octetField<P, TagId>(st, &own, rq) || !lengthField<P, LengthId>(st, &own, rq) ||
-        !halfOctetField<P, ValueId>(st, &own, rq, 4))
-        return 0;
-    closeElementWindow<P>(st, rq); // ids longer than 4 octets: rest skipped, flagged
-    return 1;
+    // A length beyond the message clears ctx: the later elements are not
+    // decoded.  Octets beyond the fourth are skipped and flagged.
+    return preBoundedElement<P>(st, ctx, rq, name, 8, [&](ElementContext *own) {
+        return octetField<P, TagId>(st, own, rq) && lengthField<P, LengthId>(st, own, rq) &&
+               halfOctetField<P, ValueId>(st, own, rq, 4);
+    });
 }
 
 template <Pass P>
@@ -66,8 +54,7 @@ int decodePAbortCause(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (!pushEnd(st))
         return 0;
     ElementContext own{0, 1, 0, 0};
-    if (!octetField<P, 3657>(st, &own, rq) || !octetField<P, 3658>(st, &own, rq) ||
-        !octetField<P, 3659>(st, &own, rq))
+    if (!octetFields<P, 3657, 3658, 3659>(st, &own, rq))
         return 0;
     closeElementWindow<P>(st, rq);
     return 1;
@@ -91,10 +78,8 @@ int decodeContents(DecodeState *st, ElementContext *ctx, uint32_t type, Request<
     case kUnidirectional:
         if (!decodeUnstructDialoguePortion<P>(st, ctx, rq))
             return 0;
-        if (ctx->present != 0 && !tagTest(st, 0x6C)) {
-            mandatoryMissing(st);
+        if (ctx->present != 0 && !mandatoryTag<P>(st, rq, 0x6C))
             return 1;
-        }
         return decodeComponentPortion<P>(st, ctx, rq);
     case kBegin:
         return decodeOriginatingId<P>(st, ctx, rq) && decodeDialoguePortion<P>(st, ctx, rq) &&
