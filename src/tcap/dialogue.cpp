@@ -149,24 +149,22 @@ int decodeStructuredDialogue(DecodeState *st, ElementContext *ctx, Request<P> *r
     return 1;
 }
 
-// The External of the structured dialogue (tag 28, mandatory): dialogue-as
-// identifier, then the [0] wrapper of the PDU.
-template <Pass P>
-int decodeExternal(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-    if (ctx->present == 0)
+// An External of a dialogue portion (tag 28, mandatory): the dialogue-as
+// identifier as fixed arcs, then the [0] wrapper whose contents `pdu`
+// decodes.
+template <Pass P, uint32_t TagId, uint32_t LengthId, uint32_t WrapperTagId,
+          uint32_t WrapperLengthId, uint32_t... OidIds, class Pdu>
+int decodeDialogueExternal(DecodeState *st, ElementContext *ctx, Request<P> *rq, Pdu &&pdu) {
+    if (ctx->present == 0 || !mandatoryTag<P>(st, rq, 0x28))
         return 1;
-    if (!mandatoryTag<P>(st, rq, 0x28))
-        return 1;
-    return delimitedConstruct<P, 3743, 3744>(
+    return delimitedConstruct<P, TagId, LengthId>(
         st, ctx, rq, "External", "INLINE BLOCK",
         [&](ElementContext *c, uint32_t) {
-            return fixedObjectIdentifier<P, true, 3749, 3750, 3751, 3752, 3753, 3754, 3755, 3756,
-                                         3757>(st, c, rq);
+            return fixedObjectIdentifier<P, true, OidIds...>(st, c, rq);
         },
         [&](ElementContext *c, uint32_t) {
-            return wrapperElement<P, 3758, 3759>(
-                st, c, rq, "Single ASN.1 Type", 0, true,
-                [&](ElementContext *own) { return decodeStructuredDialogue<P>(st, own, rq); });
+            return wrapperElement<P, WrapperTagId, WrapperLengthId>(st, c, rq, "Single ASN.1 Type",
+                                                                   0, true, pdu);
         });
 }
 
@@ -196,27 +194,22 @@ int decodeDialoguePortion(DecodeState *st, ElementContext *ctx, Request<P> *rq) 
     if (ctx->present == 0 || !tagTest(st, 0x6B))
         return 1;
     return delimitedConstruct<P, 3737, 3738>(
-        st, ctx, rq, "Dialogue Portion", "INLINE BLOCK",
-        [&](ElementContext *c, uint32_t) { return decodeExternal<P>(st, c, rq); });
+        st, ctx, rq, "Dialogue Portion", "INLINE BLOCK", [&](ElementContext *c, uint32_t) {
+            return decodeDialogueExternal<P, 3743, 3744, 3758, 3759, 3749, 3750, 3751, 3752, 3753,
+                                          3754, 3755, 3756, 3757>(
+                st, c, rq,
+                [&](ElementContext *own) { return decodeStructuredDialogue<P>(st, own, rq); });
+        });
 }
 
 template <Pass P>
 int decodeUniExternal(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Request<P> *rq) {
-    if (ctx->present == 0 || (inEoc != 0 && ctx->eocSeen != 0))
+    if (inEoc != 0 && ctx->eocSeen != 0)
         return 1;
-    if (!mandatoryTag<P>(st, rq, 0x28))
-        return 1;
-    return delimitedConstruct<P, 3622, 3623>(
-        st, ctx, rq, "External", "INLINE BLOCK",
-        [&](ElementContext *c, uint32_t) {
-            return fixedObjectIdentifier<P, true, 3717, 3718, 3719, 3720, 3721, 3722, 3723, 3724,
-                                         3725>(st, c, rq);
-        },
-        [&](ElementContext *c, uint32_t) {
-            return wrapperElement<P, 3726, 3727>(
-                st, c, rq, "Single ASN.1 Type", 0, true,
-                [&](ElementContext *own) { return decodeUnidirectionalDialogue<P>(st, own, rq); });
-        });
+    return decodeDialogueExternal<P, 3622, 3623, 3726, 3727, 3717, 3718, 3719, 3720, 3721, 3722,
+                                  3723, 3724, 3725>(
+        st, ctx, rq,
+        [&](ElementContext *own) { return decodeUnidirectionalDialogue<P>(st, own, rq); });
 }
 
 CAMEL_INSTANTIATE_UNIT(decodeDialoguePortion, DecodeState *, ElementContext *);
