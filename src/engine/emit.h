@@ -268,7 +268,7 @@ inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
 template <Pass P, uint32_t Id>
 inline int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
                           uint32_t maxOctets) {
-    if (ctx->present == 0)
+    if (ctx->present == 0 || maxOctets == 0)
         return 1;
     if (!room(st, 8)) {
         ctx->present = 0;
@@ -294,7 +294,7 @@ inline int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
 template <Pass P, uint32_t Id>
 inline int octetsField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
                        uint32_t maxOctets) {
-    if (ctx->present == 0)
+    if (ctx->present == 0 || maxOctets == 0)
         return 1;
     if (!room(st, 8)) {
         ctx->present = 0;
