@@ -34,13 +34,25 @@ inline bool tagTest(DecodeState *st, uint32_t expected) {
 }
 
 // Class-and-number test: class * 32 + number equals `expected`; the form
-// bit is ignored, so [0] matches both 0x80 and 0xA0 as 64.
+// bit is ignored, so [0] matches both 0x80 and 0xA0 as 64.  The class and
+// the number are left in spans 0 and 1, as the tag field shows them.
 inline bool tagTestClassNumber(DecodeState *st, uint32_t expected) {
     if (!room(st, 8))
         return false;
     const uint32_t octet = peekOctet(st);
-    const uint32_t value = (octet >> 6) * 32 + (octet & 0x1Fu);
-    detail::noteTestedIdentifier(st, 8, value);
+    const uint32_t cls = octet >> 6;
+    const uint32_t number = octet & 0x1Fu;
+    const uint32_t value = cls * 32 + number;
+    st->field.value = value;
+    if (st->field.spans != nullptr && st->field.spanCapacity > 1) {
+        ValueSpan *spans = st->field.spans;
+        spans[0].value = cls;
+        spans[0].firstBit = st->bitCursor + 6;
+        spans[0].lastBit = st->bitCursor + 7;
+        spans[1].value = number;
+        spans[1].firstBit = st->bitCursor;
+        spans[1].lastBit = st->bitCursor + 4;
+    }
     return value == expected;
 }
 

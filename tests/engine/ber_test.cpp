@@ -382,6 +382,28 @@ TEST(BerTagTest, ThreeForms) {
     }
 }
 
+// A test leaves what it read in the field record: the octet in span 0, or
+// the class and the number in spans 0 and 1, as the tag field shows them.
+TEST(BerTagTest, LeavesTheIdentifierInTheFieldRecord) {
+    const Bytes m = hexBytes("00 A1");
+    DecodeState *st = host_NewState(m.data(), static_cast<uint32_t>(m.size()));
+    st->bitCursor = 9;
+    st->remainingBits = 8;
+    EXPECT_FALSE(tagTestClassNumber(st, 64));
+    EXPECT_EQ(st->field.value, 65u);
+    EXPECT_EQ(st->field.spans[0].value, 2u);
+    EXPECT_EQ(st->field.spans[0].firstBit, 15u);
+    EXPECT_EQ(st->field.spans[0].lastBit, 16u);
+    EXPECT_EQ(st->field.spans[1].value, 1u);
+    EXPECT_EQ(st->field.spans[1].firstBit, 9u);
+    EXPECT_EQ(st->field.spans[1].lastBit, 13u);
+    EXPECT_TRUE(tagTest(st, 0xA1));
+    EXPECT_EQ(st->field.spans[0].value, 0xA1u);
+    EXPECT_EQ(st->field.spans[0].firstBit, 9u);
+    EXPECT_EQ(st->field.spans[0].lastBit, 16u);
+    host_FreeState(st);
+}
+
 // ---- Tag fields ------------------------------------------------------------------
 
 TEST(BerTagField, Renderings) {
