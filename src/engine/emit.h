@@ -238,7 +238,9 @@ inline int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq
 
 // The general BER length field (short, long or indefinite form): one span
 // over all length octets, value to `lengthValue`.  A length whose octets
-// are not all in the window is treated like any field that does not fit.
+// are not all in the window is treated like any field that does not fit,
+// and flagged like any length that runs past its window: the element it
+// belongs to is cut short.
 template <Pass P, uint32_t Id>
 inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     if (ctx->present == 0)
@@ -246,7 +248,9 @@ inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     const LengthPeek len = peekLength(st, 0);
     if (!len.fits) {
         st->testFlag = 0;
+        st->errorFlags |= DPX_ERR_LENGTH_BEYOND;
         ctx->present = 0;
+        noteStatus<P>(st, rq);
         return 1;
     }
     beginField<Id>(st);

@@ -23,7 +23,8 @@ enum : uint32_t {
 template <Pass P>
 int opaquePrimitive(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     Scratch &s = g_scratch<P>;
-    if (!room(st, 8)) {
+    if (!room(st, 8)) { // even the length octet runs past the window
+        st->errorFlags |= DPX_ERR_LENGTH_BEYOND;
         ctx->present = 0;
         return 1;
     }

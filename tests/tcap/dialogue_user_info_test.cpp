@@ -58,7 +58,7 @@ TEST(DialogueUserInfo, OpaqueWalkerEdges) {
         {"two primitives", "a0 07 02 01 05 04 02 aa bb", {"  ASN Type VALUE=5", "  ASN Type VALUE=aa", "  ASN Type VALUE=bb"}, 0},
         {"primitive longer than its wrapper", "a0 04 04 05 01 02", {"  ASN Type VALUE=1", "  ASN Type VALUE=2"}, DPX_ERR_LENGTH_BEYOND},
         {"nested constructed, walked flat", "a0 08 30 06 31 04 30 02 05 00", {}, 0},
-        {"last length octet missing: the walk ends", "a0 03 05 00 04", {}, 0},
+        {"last length octet missing: flagged, the walk ends", "a0 03 05 00 04", {}, DPX_ERR_LENGTH_BEYOND},
         {"empty", "a0 00", {}, 0},
     };
     for (const Case &c : cases) {

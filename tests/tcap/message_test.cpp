@@ -136,6 +136,9 @@ TEST(Message, MalformedLengths) {
         {"62 89 00 00 00 00 00 00 00 00 06 48 04 01 02 03 04", 0, 5}, // non-minimal length
         {"67 06 49 01 01 4a 05 01", DPX_ERR_LENGTH_BEYOND, 8},
         {"62 08 48 04 01 02 03 04 00 00", DPX_ERR_LEFTOVER, 5},
+        // a portion's long-form length cut by the message window
+        {"62 08 48 04 01 02 03 04 6b 81", DPX_ERR_LENGTH_BEYOND | DPX_ERR_LEFTOVER, 6},
+        {"62 07 48 04 01 02 03 04 6c", DPX_ERR_LENGTH_BEYOND, 6},
     };
     for (const Case &c : cases) {
         SCOPED_TRACE(c.hex);
