@@ -4,7 +4,6 @@
 // exact copy of the bytes, so the address sanitizer sees any over-read).
 #include <gtest/gtest.h>
 
-#include <fstream>
 #include <random>
 #include <string>
 
@@ -13,32 +12,6 @@
 namespace {
 
 using camel::test::Bytes;
-
-std::vector<Bytes> sampleMessages() {
-    std::vector<Bytes> out;
-    for (const char *name : {"messages.txt", "dialogue.txt", "components.txt"}) {
-        std::ifstream in(std::string(DPX_SOURCE_DIR) + "/samples/" + name);
-        std::string line;
-        while (std::getline(in, line)) {
-            const size_t hash = line.find('#');
-            if (hash != std::string::npos)
-                line.resize(hash);
-            try {
-                Bytes m = camel::test::hexBytes(line);
-                if (!m.empty())
-                    out.push_back(std::move(m));
-            } catch (const std::exception &) {
-            }
-        }
-    }
-    // A few fixed messages so the test has seeds even without samples.
-    out.push_back(camel::test::hexBytes("62 06 48 04 01 02 03 04"));
-    out.push_back(camel::test::hexBytes("67 09 49 04 aa bb cc dd 4a 01 01"));
-    out.push_back(camel::test::hexBytes(
-        "6281B84801F76B242880060700118605010101A080608080020780A1090607040000010032010000000000"
-        "6C80A181880201B58001490201000000000000"));
-    return out;
-}
 
 Bytes mutate(const Bytes &seed, std::mt19937 &rng) {
     Bytes m = seed;
@@ -63,7 +36,10 @@ Bytes mutate(const Bytes &seed, std::mt19937 &rng) {
 }
 
 TEST(Fuzz, MutatedMessagesDecodeSafelyInEveryPass) {
-    const auto seeds = sampleMessages();
+    auto seeds = camel::test::sampleMessages();
+    // A few fixed messages so the test has seeds even without samples.
+    seeds.push_back(camel::test::hexBytes("62 06 48 04 01 02 03 04"));
+    seeds.push_back(camel::test::hexBytes("67 09 49 04 aa bb cc dd 4a 01 01"));
     std::mt19937 rng(20261206);
     for (int i = 0; i < 3000; ++i) {
         const Bytes m = mutate(seeds[static_cast<size_t>(i) % seeds.size()], rng);

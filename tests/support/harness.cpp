@@ -2,7 +2,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstring>
+#include <filesystem>
+#include <fstream>
 #include <stdexcept>
 
 namespace camel::test {
@@ -31,6 +34,26 @@ Bytes hexBytes(std::string_view hex) {
     }
     if (high >= 0)
         throw std::invalid_argument("odd number of hex digits");
+    return out;
+}
+
+std::vector<Bytes> sampleMessages() {
+    std::vector<std::filesystem::path> files;
+    for (const auto &entry : std::filesystem::directory_iterator(DPX_SOURCE_DIR "/samples"))
+        if (entry.path().extension() == ".txt")
+            files.push_back(entry.path());
+    std::sort(files.begin(), files.end());
+    std::vector<Bytes> out;
+    for (const auto &file : files) {
+        std::ifstream in(file);
+        std::string line;
+        while (std::getline(in, line)) {
+            line.resize(std::min(line.size(), line.find('#')));
+            Bytes m = hexBytes(line);
+            if (!m.empty())
+                out.push_back(std::move(m));
+        }
+    }
     return out;
 }
 

@@ -17,6 +17,10 @@ using Bytes = std::vector<uint8_t>;
 // Hex digits to bytes; blanks and colons are ignored.
 Bytes hexBytes(std::string_view hex);
 
+// Every message of the bundled samples/*.txt files (one a line, `#`
+// comments), in file and line order.
+std::vector<Bytes> sampleMessages();
+
 struct Span {
     uint32_t first, last, value;
     bool operator==(const Span &) const = default;
