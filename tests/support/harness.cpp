@@ -1,5 +1,7 @@
 #include "support/harness.h"
 
+#include "../../tools/dpx-decode/key_layout.h"
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -87,17 +89,6 @@ std::string textDump(const Decoded &d) {
     return out;
 }
 
-KeyShape keyShape(uint32_t entry) {
-    switch (entry) {
-    case 10: case 12: case 15: case 17: case 21: case 26: case 29:
-        return KeyShape::Variable;
-    case 18: case 20:
-        return KeyShape::Word;
-    default:
-        return KeyShape::Octet;
-    }
-}
-
 namespace {
 
 constexpr size_t kKeyBufferSize = 4096;
@@ -106,34 +97,12 @@ PassEnd endOf(int result, const DecodeState *st) {
     return PassEnd{result, st->remainingBits, st->errorFlags, st->bitCursor};
 }
 
+// The key entries present in a buffer of the stand-in key layout, read the
+// way dpx-decode reads them.
 std::vector<Key> readKeys(const Bytes &buffer) {
     std::vector<Key> keys;
-    for (uint32_t i = 0; i < DPX_KEY_ENTRY_COUNT; ++i) {
-        if ((buffer[i / 8] & (1u << (i % 8))) == 0)
-            continue;
-        const uint8_t *slot = buffer.data() + HOST_KEY_SLOT_BASE + HOST_KEY_SLOT_SIZE * i;
-        Key k{i, {}, 0, false};
-        switch (keyShape(i)) {
-        case KeyShape::Octet:
-            k.value = {slot[0]};
-            k.bits = 8;
-            break;
-        case KeyShape::Word:
-            k.value = {slot[0], slot[1]};
-            k.bits = 16;
-            break;
-        case KeyShape::Variable: {
-            const uint32_t bits = slot[0] | (slot[1] << 8);
-            const uint32_t offset = slot[2] | (slot[3] << 8);
-            k.bits = bits;
-            k.overflow = (offset & DPX_KEY_OVERFLOW_BIT) != 0;
-            if (!k.overflow && offset + (bits + 7) / 8 <= buffer.size())
-                k.value.assign(buffer.begin() + offset, buffer.begin() + offset + (bits + 7) / 8);
-            break;
-        }
-        }
-        keys.push_back(std::move(k));
-    }
+    for (const auto &e : dpxdecode::readKeyEntries(buffer.data(), static_cast<uint32_t>(buffer.size())))
+        keys.push_back({e.index, hexBytes(e.value), e.bits, e.overflow});
     return keys;
 }
 

@@ -100,8 +100,4 @@ uint32_t checkReallocFailures(const Bytes &message);
 // The decoded-field texts of a message joined by newlines.
 std::string textDump(const Decoded &d);
 
-// The entry's key form in the stand-in key layout.
-enum class KeyShape { Octet, Word, Variable };
-KeyShape keyShape(uint32_t entry);
-
 } // namespace camel::test
