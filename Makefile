@@ -68,3 +68,31 @@ bench: build
 
 clean:
 	rm -rf build
+
+# ---- fuzzing -------------------------------------------------------------------
+# make fuzz: the project's packages plus clang and libFuzzer (FUZZ_PACKAGES,
+# installed here only), then the fuzz preset (build/fuzz) and camel_fuzz for
+# FUZZ_TIME seconds over build/fuzz/corpus (new inputs), build/fuzz/seeds
+# (samples/*.txt) and fuzz/corpus.  Crash inputs land in build/fuzz/.
+FUZZ_PACKAGES := clang libclang-rt-14-dev
+FUZZ_TIME ?= 300
+FUZZ_ARGS ?= -max_len=512 -dict=fuzz/camel.dict
+
+.PHONY: fuzz
+fuzz: deps
+	@missing=""; \
+	for pkg in $(FUZZ_PACKAGES); do \
+	    dpkg -s "$$pkg" 2>/dev/null | grep -q '^Status: install ok installed' \
+	        || missing="$$missing $$pkg"; \
+	done; \
+	if [ -n "$$missing" ]; then \
+	    echo "make fuzz: installing$$missing"; \
+	    $(SUDO) apt-get update -qq; \
+	    $(SUDO) env DEBIAN_FRONTEND=noninteractive \
+	        apt-get install -y -qq --no-install-recommends $$missing; \
+	fi
+	cmake --preset fuzz
+	cmake --build --preset fuzz
+	mkdir -p build/fuzz/corpus
+	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
+	    $(FUZZ_ARGS) build/fuzz/corpus build/fuzz/seeds fuzz/corpus
