@@ -66,9 +66,7 @@ int decodeOperation(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Reques
         if (decodeArgument != nullptr && !decodeArgument(st, ctx, rq))
             return 0;
     }
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 CAMEL_INSTANTIATE_UNIT(decodeOperation, DecodeState *, ElementContext *, uint32_t);

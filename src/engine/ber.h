@@ -80,6 +80,15 @@ inline bool mandatoryTag(DecodeState *st, Request<P> *rq, uint32_t tag) {
     return false;
 }
 
+// Element end: pops the element's start position; in the message-view pass
+// the status then reflects every flag raised inside the element.
+template <Pass P>
+inline int elementEnd(DecodeState *st, Request<P> *rq) {
+    popPos(st);
+    noteStatus<P>(st, rq);
+    return 1;
+}
+
 // ---- Element windows ---------------------------------------------------------
 
 // Narrows the window to the element at the cursor, whose identifier takes
@@ -123,9 +132,7 @@ inline int octetFieldsElement(DecodeState *st, ElementContext *ctx, Request<P> *
                               const char *name) {
     if (!elementStart(st, name) || !octetFields<P, Ids...>(st, ctx, rq))
         return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 // A pre-bounded element whose tag test has succeeded: its window is set
@@ -189,9 +196,7 @@ inline int eocCheck(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
         if (!bitsField<P, fid::kEndOfContents>(st, rq, 0, 16, 16))
             return 0;
     }
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 // ---- Content blocks ------------------------------------------------------------
@@ -237,9 +242,7 @@ inline int contentBlock(DecodeState *st, ElementContext *ctx, Request<P> *rq,
     if (!ok)
         return 0;
     ctx->present = block.present;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 // A delimited construct whose tag test has succeeded: element start, tag
@@ -253,9 +256,7 @@ inline int delimitedConstruct(DecodeState *st, ElementContext *ctx, Request<P> *
         return 0;
     if (!contentBlock<P>(st, ctx, rq, blockName, members...))
         return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 // ---- Element loop ----------------------------------------------------------------

@@ -98,9 +98,7 @@ int decodeComponentBody(DecodeState *st, ElementContext *ctx, const char *name, 
         s.componentSize = componentSizeOf(s);
     if (!contentBlock<P>(st, ctx, rq, "INLINE BLOCK", members...))
         return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 // The four components.  Each is optional where it stands: a failed tag
@@ -221,9 +219,7 @@ int decodeComponentPortion(DecodeState *st, ElementContext *ctx, Request<P> *rq)
     }
     if (!ok)
         return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 // The identifier octet of an operation code: no value is compared, the

@@ -66,9 +66,7 @@ int decodeDiagnostic(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
             st, ctx, "Service Provider", rq);
     if (!ok)
         return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 template <Pass P>
@@ -144,9 +142,7 @@ int decodeStructuredDialogue(DecodeState *st, ElementContext *ctx, Request<P> *r
     }
     if (!ok)
         return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 // An External of a dialogue portion (tag 28, mandatory): the dialogue-as

@@ -52,9 +52,7 @@ int decodeAcObjectIdentifier(DecodeState *st, ElementContext *ctx, Request<P> *r
         if (!ok)
             return 0;
     }
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 } // namespace
@@ -76,9 +74,7 @@ int decodeApplicationContextName(DecodeState *st, ElementContext *ctx, uint32_t,
     if (!elementStart(st, "Application Context Name") ||
         !octetFields<P, 3789, 3790>(st, ctx, rq) || !decodeAcObjectIdentifier<P>(st, ctx, rq))
         return 0;
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 CAMEL_INSTANTIATE_UNIT(decodeProtocolVersion, DecodeState *, ElementContext *, uint32_t);

@@ -157,9 +157,7 @@ int decodeMessage(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
             return 0;
     }
     popPos(st);
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 CAMEL_INSTANTIATE_UNIT(decodeMessage, DecodeState *, ElementContext *);

@@ -88,9 +88,7 @@ int decodeUserInfoElements(DecodeState *st, ElementContext *ctx, uint32_t inEoc,
         if (!decodeUserInfoItem<P>(st, ctx, rq))
             return 0;
     }
-    popPos(st);
-    noteStatus<P>(st, rq);
-    return 1;
+    return elementEnd<P>(st, rq);
 }
 
 } // namespace
