@@ -98,16 +98,20 @@ void finish(benchmark::State &state, size_t messages, int64_t failed) {
     state.counters["failed"] = static_cast<double>(failed);
 }
 
+// Why a benchmark cannot run (empty when it can): the corpus could not be
+// read, or a state could not be prepared.
+const char *setupError(const Corpus &c, const Prepared &p) {
+    if (!c.error.empty())
+        return c.error.c_str();
+    return p.ok() ? "" : "host_NewState failed";
+}
+
 // The decoded-field, display and message-view passes.
 void runPreDecode(benchmark::State &state, uint8_t (*pass)(PreDecodeRequest *)) {
     const Corpus &c = corpus();
-    if (!c.error.empty()) {
-        state.SkipWithError(c.error.c_str());
-        return;
-    }
     Prepared p(c);
-    if (!p.ok()) {
-        state.SkipWithError("host_NewState failed");
+    if (const char *error = setupError(c, p); *error != '\0') {
+        state.SkipWithError(error);
         return;
     }
     host_ClearRecords();
@@ -137,13 +141,9 @@ void BM_MessageViewPass(benchmark::State &state) { runPreDecode(state, dpx_PreDe
 void BM_KeyFieldPass(benchmark::State &state) {
     constexpr uint32_t kBufferSize = 4096;
     const Corpus &c = corpus();
-    if (!c.error.empty()) {
-        state.SkipWithError(c.error.c_str());
-        return;
-    }
     Prepared p(c);
-    if (!p.ok()) {
-        state.SkipWithError("host_NewState failed");
+    if (const char *error = setupError(c, p); *error != '\0') {
+        state.SkipWithError(error);
         return;
     }
     std::vector<uint8_t> buffer(kBufferSize, 0);
