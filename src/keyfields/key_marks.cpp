@@ -78,26 +78,29 @@ int32_t keyFieldPrologue(KeyFieldRequest *request) {
     return 1;
 }
 
-int markOctetKey(KeyFieldRequest *request, uint32_t entry, uint32_t value) {
+namespace {
+
+// Marks a fixed-size key: presence bit, then the low `bytes` bytes of the
+// value, little-endian, at the entry's value offset.
+int markFixedKey(KeyFieldRequest *request, uint32_t entry, uint32_t value, uint32_t bytes) {
     uint8_t *keyBuffer = request->keyBuffer;
     if (keyBuffer == nullptr || entry >= DPX_KEY_ENTRY_COUNT)
         return 1;
     const KeyTableEntry &e = g_keyTable[entry];
     setPresence(keyBuffer, e);
-    keyBuffer[e.valueOffset] = static_cast<uint8_t>(value);
+    for (uint32_t i = 0; i < bytes; ++i)
+        keyBuffer[e.valueOffset + i] = static_cast<uint8_t>(value >> (8 * i));
     return 1;
 }
 
+} // namespace
+
+int markOctetKey(KeyFieldRequest *request, uint32_t entry, uint32_t value) {
+    return markFixedKey(request, entry, value, 1);
+}
+
 int markWordKey(KeyFieldRequest *request, uint32_t entry, uint32_t value) {
-    uint8_t *keyBuffer = request->keyBuffer;
-    if (keyBuffer == nullptr || entry >= DPX_KEY_ENTRY_COUNT)
-        return 1;
-    const KeyTableEntry &e = g_keyTable[entry];
-    setPresence(keyBuffer, e);
-    uint8_t *word = keyBuffer + e.valueOffset;
-    word[0] = static_cast<uint8_t>(value);
-    word[1] = static_cast<uint8_t>(value >> 8);
-    return 1;
+    return markFixedKey(request, entry, value, 2);
 }
 
 int markVariableKey(KeyFieldRequest *request, uint32_t entry, const FieldRecord *field) {
