@@ -3,6 +3,7 @@
 // decodes that operation's argument.
 #include <cstdint>
 
+#include "cap/arguments.h"
 #include "cap/units.h"
 #include "engine/ber.h"
 #include "tcap/units.h"
@@ -11,35 +12,14 @@ namespace camel {
 
 namespace {
 
-// The unit that decodes one operation's argument, starting at the
-// argument's identifier octet.
-template <Pass P>
-using ArgumentUnit = int (*)(DecodeState *, ElementContext *, Request<P> *);
-
-template <Pass P>
-struct ArgumentEntry {
-    uint32_t code;
-    ArgumentUnit<P> decode; // null: the operation carries no argument
-};
-
-// Argument units by operation code, compared in this order; the first
-// match wins.  A code not listed here has no argument the module decodes:
-// its argument octets are left where they are (in a definite-length Invoke
-// they are skipped as left-over bits of its window).
-template <Pass P>
-inline constexpr ArgumentEntry<P> kArgumentUnits[] = {
-    {55, nullptr}, // Activity Test
-    {31, nullptr}, // Continue
-    {18, nullptr}, // Disconnect Forward Connection
-    {65, nullptr}, // SMS Continue
-    {70, nullptr}, // GPRS Activity Test
-};
-
-template <Pass P>
-ArgumentUnit<P> argumentUnitOf(uint32_t code) {
-    for (const ArgumentEntry<P> &entry : kArgumentUnits<P>)
-        if (entry.code == code)
-            return entry.decode;
+// The argument table of an operation code: the first entry of the code in
+// the dispatcher's order.  A code not listed has no argument the module
+// decodes: its argument octets are left where they are (in a definite-length
+// Invoke they are skipped as left-over bits of its window).
+const MemberTable *argumentOf(uint32_t code) {
+    for (uint32_t i = 0; i < kArgumentCount; ++i)
+        if (kArguments[i].code == code)
+            return kArguments[i].table;
     return nullptr;
 }
 
@@ -62,8 +42,8 @@ int decodeOperation(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Reques
     if (ctx->present != 0) {
         const uint32_t code = st->field.value;
         g_scratch<P>.choiceTag = code;
-        const ArgumentUnit<P> decodeArgument = argumentUnitOf<P>(code);
-        if (decodeArgument != nullptr && !decodeArgument(st, ctx, rq))
+        const MemberTable *argument = argumentOf(code);
+        if (argument != nullptr && !walkTable<P>(st, ctx, rq, *argument))
             return 0;
     }
     return elementEnd<P>(st, rq);

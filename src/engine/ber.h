@@ -303,16 +303,20 @@ inline int elementLoop(DecodeState *st, ElementContext *ctx, Request<P> *rq,
 
 // A "Choice" field: the alternative's identifier octet, reported by name
 // and kept in `choiceTag` for the selection that follows.
-template <Pass P, uint32_t Id>
-inline int choiceField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+template <Pass P>
+int choiceField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
     if (ctx->present == 0 || !room(st, 8)) {
         ctx->present = 0;
         return 1;
     }
-    if (!bitsField<P, Id>(st, rq, 0, 8, 8))
+    if (!bitsField<P>(st, rq, f, 0, 8, 8))
         return 0;
     g_scratch<P>.choiceTag = st->field.value;
     return 1;
+}
+template <Pass P, uint32_t Id>
+inline int choiceField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    return choiceField<P>(st, ctx, rq, Field<Id>::index);
 }
 
 // SEQUENCE OF at argument level: items while the next identifier is

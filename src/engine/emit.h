@@ -32,14 +32,23 @@ inline void noteStatus(const DecodeState *st, Request<P> *rq) {
 }
 
 // Reset the field record and copy the field's label into it.
+inline void beginField(DecodeState *st, FieldIndex f) {
+    ResetFieldRecord(&st->field);
+    const char *label = kFields[f].label;
+    if (st->field.label != nullptr) {
+        size_t n = std::strlen(label);
+        if (n > DPX_TEXT_BUFFER_SIZE - 1)
+            n = DPX_TEXT_BUFFER_SIZE - 1;
+        std::memcpy(st->field.label, label, n);
+        st->field.label[n] = '\0';
+    }
+}
+
 template <uint32_t Id>
 inline void beginField(DecodeState *st) {
-    ResetFieldRecord(&st->field);
-    constexpr const char *label = Field<Id>::def.label;
-    constexpr size_t n = std::char_traits<char>::length(label);
-    static_assert(n < DPX_TEXT_BUFFER_SIZE, "label longer than the host's label buffer");
-    if (st->field.label != nullptr)
-        std::memcpy(st->field.label, label, n + 1);
+    static_assert(std::char_traits<char>::length(Field<Id>::def.label) < DPX_TEXT_BUFFER_SIZE,
+                  "label longer than the host's label buffer");
+    beginField(st, Field<Id>::index);
 }
 
 // Makes span `highest` writable; flags and fails when the array cannot grow.
@@ -68,14 +77,18 @@ inline uint32_t setSpan(DecodeState *st, uint32_t index, uint32_t from, uint32_t
 
 namespace detail {
 
-inline const char *nameOf(const FieldDef &f, uint32_t value) {
+inline const char *nameOf(const FieldDef &f, uint32_t value, bool display) {
+    if (display)
+        for (uint16_t i = 0; i < f.displayNameCount; ++i)
+            if (f.displayNames[i].code == value)
+                return f.displayNames[i].name;
     for (uint16_t i = 0; i < f.nameCount; ++i)
         if (f.names[i].code == value)
             return f.names[i].name;
-    return "";
+    return f.otherName;
 }
 
-inline void renderValue(const FieldDef &f, const FieldRecord &field, TextBuf &out) {
+inline void renderValue(const FieldDef &f, const FieldRecord &field, TextBuf &out, bool display) {
     switch (f.render) {
     case Render::Tag:
     case Render::Hex:
@@ -101,7 +114,7 @@ inline void renderValue(const FieldDef &f, const FieldRecord &field, TextBuf &ou
             out.hex(field.spans[i].value);
         break;
     case Render::Enum:
-        out.append(nameOf(f, field.value));
+        out.append(nameOf(f, field.value, display));
         break;
     }
 }
@@ -122,16 +135,16 @@ inline uint32_t spanSelector(const FieldDef &f, uint32_t spans) {
 
 // Step 8 of every field: hand the finished field to the host in the pass's
 // way.  Returns 0 only when the pass must end (a key value that does not fit).
-template <Pass P, uint32_t Id>
-inline int report(DecodeState *st, Request<P> *rq) {
-    constexpr const FieldDef &f = Field<Id>::def;
+template <Pass P>
+int report(DecodeState *st, Request<P> *rq, FieldIndex index) {
+    const FieldDef &f = kFields[index];
     if constexpr (P == Pass::Decoded || P == Pass::Display) {
         TextBuffers &buf = g_text<P>;
         TextBuf text{buf.text, sizeof buf.text, 0};
         TextBuf value{buf.valueText, sizeof buf.valueText, 0};
         text.clear();
         value.clear();
-        detail::renderValue(f, st->field, value);
+        detail::renderValue(f, st->field, value, P == Pass::Display);
         if constexpr (P == Pass::Decoded) {
             if (rq->outputLines != nullptr) {
                 char *line = rq->outputLines +
@@ -146,94 +159,108 @@ inline int report(DecodeState *st, Request<P> *rq) {
             text.append(value.data, value.len);
             pu_AddDecodedFieldsData(rq, st->field.spansReported, st->field.spans, text.data,
                                     detail::spanSelector(f, st->field.spansReported),
-                                    st->field.label, Id, 0, 0);
+                                    st->field.label, f.id, 0, 0);
         } else {
             text.append(value.data, value.len);
-            pu_AddFieldsToDisplayData(rq, text.data, Field<Id>::displayId);
+            pu_AddFieldsToDisplayData(rq, text.data, kDisplayIds.id[index]);
         }
     } else if constexpr (P == Pass::MessageView) {
         noteStatus<P>(st, rq);
     } else {
-        if constexpr (f.keyForm == KeyForm::Octet)
+        switch (f.keyForm) {
+        case KeyForm::Octet:
             return markOctetKey(rq, static_cast<uint32_t>(f.keyEntry), st->field.value);
-        else if constexpr (f.keyForm == KeyForm::Word)
+        case KeyForm::Word:
             return markWordKey(rq, static_cast<uint32_t>(f.keyEntry), st->field.value);
-        else if constexpr (f.keyForm == KeyForm::Variable)
+        case KeyForm::Variable:
             return markVariableKey(rq, static_cast<uint32_t>(f.keyEntry), &st->field);
-        else
-            (void)st, (void)rq;
+        case KeyForm::None:
+            break;
+        }
     }
     return 1;
 }
 
-// Steps 6 to 8: spans reported, field id, consume `width` bits, report.
 template <Pass P, uint32_t Id>
-inline int finishField(DecodeState *st, Request<P> *rq, uint32_t width) {
+inline int report(DecodeState *st, Request<P> *rq) {
+    return report<P>(st, rq, Field<Id>::index);
+}
+
+// Steps 6 to 8: spans reported, field id, consume `width` bits, report.
+template <Pass P>
+inline int finishField(DecodeState *st, Request<P> *rq, FieldIndex f, uint32_t width) {
     st->field.spansReported = st->field.spansFilled;
-    st->field.fieldId = Id;
+    st->field.fieldId = kFields[f].id;
     consume(st, width);
-    return report<P, Id>(st, rq);
+    return report<P>(st, rq, f);
 }
 
 // ---- Common field shapes ---------------------------------------------------
+//
+// Each shape takes the field's catalogue position at run time, so one
+// instance per pass serves every field; the wrappers taking the field id as
+// a template argument check at compile time that the id is declared.
 
 // A field of `width` bits (1..32) at `offset` bits after the cursor, one
 // span, consuming `consumed` bits.  The caller has made sure the bits are
 // in the window.
-template <Pass P, uint32_t Id>
-inline int bitsField(DecodeState *st, Request<P> *rq, uint32_t offset, uint32_t width,
-                     uint32_t consumed) {
-    beginField<Id>(st);
+template <Pass P>
+int bitsField(DecodeState *st, Request<P> *rq, FieldIndex f, uint32_t offset, uint32_t width,
+              uint32_t consumed) {
+    beginField(st, f);
     if (!ensureSpans(st, 0))
         return 0;
     st->field.value = setSpan(st, 0, offset, offset + width - 1);
-    return finishField<P, Id>(st, rq, consumed);
+    return finishField<P>(st, rq, f, consumed);
+}
+
+// A field of `width` bits at `offset` that must fit in the window: when the
+// bits are not there the element is marked absent and nothing is shown.
+template <Pass P>
+int fittedBitsField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+                    uint32_t offset, uint32_t width, uint32_t consumed) {
+    if (ctx->present == 0)
+        return 1;
+    const uint32_t need = offset + width > consumed ? offset + width : consumed;
+    if (!room(st, need)) {
+        ctx->present = 0;
+        return 1;
+    }
+    return bitsField<P>(st, rq, f, offset, width, consumed);
 }
 
 // A one-octet field (tag, fixed length octet, one-octet value).  Emitted
 // only while the element is present and the octet is in the window;
 // otherwise the element is marked absent.
-template <Pass P, uint32_t Id>
-inline int octetField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-    if (ctx->present == 0)
-        return 1;
-    if (!room(st, 8)) {
-        ctx->present = 0;
-        return 1;
-    }
-    return bitsField<P, Id>(st, rq, 0, 8, 8);
+template <Pass P>
+int octetField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
+    return fittedBitsField<P>(st, ctx, rq, f, 0, 8, 8);
 }
 
 // A tag field of the class-and-number form: two spans (bits 8-7 and bits
 // 5-1), value class * 32 + number, so [0] shows as 40 in either form.
-template <Pass P, uint32_t Id>
-inline int classNumberTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+template <Pass P>
+int classNumberTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
     if (ctx->present == 0)
         return 1;
     if (!room(st, 8)) {
         ctx->present = 0;
         return 1;
     }
-    beginField<Id>(st);
+    beginField(st, f);
     if (!ensureSpans(st, 1))
         return 0;
     const uint32_t cls = setSpan(st, 0, 6, 7);
     const uint32_t number = setSpan(st, 1, 0, 4);
     st->field.value = cls * 32 + number;
-    return finishField<P, Id>(st, rq, 8);
+    return finishField<P>(st, rq, f, 8);
 }
 
 // A two-octet tag field (tag numbers above 30): the 16 bits read as one
 // value, first octet in the low byte.
-template <Pass P, uint32_t Id>
-inline int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-    if (ctx->present == 0)
-        return 1;
-    if (!room(st, 16)) {
-        ctx->present = 0;
-        return 1;
-    }
-    return bitsField<P, Id>(st, rq, 0, 16, 16);
+template <Pass P>
+int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
+    return fittedBitsField<P>(st, ctx, rq, f, 0, 16, 16);
 }
 
 // The general BER length field (short, long or indefinite form): one span
@@ -241,8 +268,8 @@ inline int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq
 // are not all in the window is treated like any field that does not fit,
 // and flagged like any length that runs past its window: the element it
 // belongs to is cut short.
-template <Pass P, uint32_t Id>
-inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+template <Pass P>
+int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
     if (ctx->present == 0)
         return 1;
     const LengthPeek len = peekLength(st, 0);
@@ -253,7 +280,7 @@ inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
         noteStatus<P>(st, rq);
         return 1;
     }
-    beginField<Id>(st);
+    beginField(st, f);
     if (!ensureSpans(st, 0))
         return 0;
     setSpan(st, 0, 0, (len.bits > 32 ? 32 : len.bits) - 1);
@@ -264,14 +291,14 @@ inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     Scratch &s = g_scratch<P>;
     s.lengthValue = static_cast<uint32_t>(len.value);
     s.lengthOctetCount = len.octetCount;
-    return finishField<P, Id>(st, rq, len.bits);
+    return finishField<P>(st, rq, f, len.bits);
 }
 
 // A value of up to `maxOctets` octets (at most what the window holds) as
 // half-octet spans, high half first: value = value * 16 + half.
-template <Pass P, uint32_t Id>
-inline int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
-                          uint32_t maxOctets) {
+template <Pass P>
+int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+                   uint32_t maxOctets) {
     if (ctx->present == 0 || maxOctets == 0)
         return 1;
     if (!room(st, 8)) {
@@ -281,7 +308,7 @@ inline int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
     uint32_t n = st->remainingBits / 8;
     if (n > maxOctets)
         n = maxOctets;
-    beginField<Id>(st);
+    beginField(st, f);
     if (!ensureSpans(st, 2 * n - 1))
         return 0;
     uint32_t value = 0;
@@ -290,14 +317,39 @@ inline int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
         value = value * 16 + setSpan(st, 2 * i + 1, 8 * i, 8 * i + 3);
     }
     st->field.value = value;
-    return finishField<P, Id>(st, rq, 8 * n);
+    return finishField<P>(st, rq, f, 8 * n);
+}
+
+// Up to `maxDigits` half-octet digits (at most what the window holds), LOW
+// half of each octet first (BCD telephony digits): one span per digit,
+// value = value * 16 + digit.  A field of no digits is not shown.
+template <Pass P>
+int bcdDigitsField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+                   uint32_t maxDigits) {
+    if (ctx->present == 0)
+        return 1;
+    uint32_t n = st->remainingBits / 4;
+    if (n > maxDigits)
+        n = maxDigits;
+    if (n == 0)
+        return 1;
+    beginField(st, f);
+    if (!ensureSpans(st, n - 1))
+        return 0;
+    uint32_t value = 0;
+    for (uint32_t i = 0; i < n; ++i) {
+        const uint32_t low = 8 * (i / 2) + ((i & 1u) != 0 ? 4 : 0);
+        value = value * 16 + setSpan(st, i, low, low + 3);
+    }
+    st->field.value = value;
+    return finishField<P>(st, rq, f, 4 * n);
 }
 
 // A value of up to `maxOctets` octets, one span per octet, value = value *
 // 256 + octet.
-template <Pass P, uint32_t Id>
-inline int octetsField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
-                       uint32_t maxOctets) {
+template <Pass P>
+int octetsField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+                uint32_t maxOctets) {
     if (ctx->present == 0 || maxOctets == 0)
         return 1;
     if (!room(st, 8)) {
@@ -307,14 +359,51 @@ inline int octetsField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
     uint32_t n = st->remainingBits / 8;
     if (n > maxOctets)
         n = maxOctets;
-    beginField<Id>(st);
+    beginField(st, f);
     if (!ensureSpans(st, n - 1))
         return 0;
     uint32_t value = 0;
     for (uint32_t i = 0; i < n; ++i)
         value = value * 256 + setSpan(st, i, 8 * i, 8 * i + 7);
     st->field.value = value;
-    return finishField<P, Id>(st, rq, 8 * n);
+    return finishField<P>(st, rq, f, 8 * n);
+}
+
+// ---- Compile-time-checked wrappers -------------------------------------------
+
+template <Pass P, uint32_t Id>
+inline int finishField(DecodeState *st, Request<P> *rq, uint32_t width) {
+    return finishField<P>(st, rq, Field<Id>::index, width);
+}
+template <Pass P, uint32_t Id>
+inline int bitsField(DecodeState *st, Request<P> *rq, uint32_t offset, uint32_t width,
+                     uint32_t consumed) {
+    return bitsField<P>(st, rq, Field<Id>::index, offset, width, consumed);
+}
+template <Pass P, uint32_t Id>
+inline int octetField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    return octetField<P>(st, ctx, rq, Field<Id>::index);
+}
+template <Pass P, uint32_t Id>
+inline int classNumberTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    return classNumberTagField<P>(st, ctx, rq, Field<Id>::index);
+}
+template <Pass P, uint32_t Id>
+inline int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    return twoOctetTagField<P>(st, ctx, rq, Field<Id>::index);
+}
+template <Pass P, uint32_t Id>
+inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    return lengthField<P>(st, ctx, rq, Field<Id>::index);
+}
+template <Pass P, uint32_t Id>
+inline int halfOctetField(DecodeState *st, ElementContext *ctx, Request<P> *rq,
+                          uint32_t maxOctets) {
+    return halfOctetField<P>(st, ctx, rq, Field<Id>::index, maxOctets);
+}
+template <Pass P, uint32_t Id>
+inline int octetsField(DecodeState *st, ElementContext *ctx, Request<P> *rq, uint32_t maxOctets) {
+    return octetsField<P>(st, ctx, rq, Field<Id>::index, maxOctets);
 }
 
 } // namespace camel

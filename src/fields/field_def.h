@@ -39,6 +39,13 @@ struct FieldDef {
     uint16_t width = 0;            // bits; 0 for variable width
     const ValueName *names = nullptr;
     uint16_t nameCount = 0;
+    // Display-pass names where they differ from the decoded-field names;
+    // a value not listed here is shown with its decoded-field name.
+    const ValueName *displayNames = nullptr;
+    uint16_t displayNameCount = 0;
+    // The name of a value that neither table lists ("Reserved" in some
+    // tables); empty by default.
+    const char *otherName = "";
     int8_t keyEntry = -1;          // key table entry, -1 for none
     KeyForm keyForm = KeyForm::None;
     uint8_t selector = 0xFF;       // span selector override; 0xFF: derived
@@ -53,6 +60,18 @@ struct FieldDef {
         FieldDef f = *this;
         f.keyEntry = static_cast<int8_t>(entry);
         f.keyForm = form;
+        return f;
+    }
+    template <size_t N>
+    constexpr FieldDef display(const ValueName (&shown)[N]) const {
+        FieldDef f = *this;
+        f.displayNames = shown;
+        f.displayNameCount = static_cast<uint16_t>(N);
+        return f;
+    }
+    constexpr FieldDef otherwise(const char *name) const {
+        FieldDef f = *this;
+        f.otherName = name;
         return f;
     }
     constexpr FieldDef spanSelector(uint8_t s) const {
@@ -71,6 +90,11 @@ constexpr FieldDef headerLength(uint32_t id, const char *label = "LENGTH") {
 }
 constexpr FieldDef blockLength(uint32_t id, const char *label = "LENGTH") {
     return FieldDef{.id = id, .label = label, .render = Render::LenBlock, .width = 0};
+}
+// The general length field of a CAMEL argument element: "LENGTH", shown
+// with two extra blanks.
+constexpr FieldDef argLength(uint32_t id, const char *label = "LENGTH") {
+    return FieldDef{.id = id, .label = label, .textIndent = 2, .render = Render::LenHeader, .width = 0};
 }
 // A length octet read as a plain one-octet count.
 constexpr FieldDef octetLength(uint32_t id, const char *label = "  Length") {

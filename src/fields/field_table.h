@@ -109,6 +109,157 @@ inline constexpr FieldDef kFields[] = {
     enumField(3876, "Operation Code Tag", names::kOperationCodeTag),
     octetLength(3668),
     enumField(1066, "Operation ID(Invoke)", names::kOperation).key(5, KeyForm::Octet),
+
+    // ==== CAMEL operation arguments: argument skeletons and the element
+    // ==== tags the argument tables show (cap/arguments.cpp)
+    // Assist Request Instructions
+    tagField(1079, "Sequence Tag"),
+    argLength(1080),
+    tagField(1429, "Correlation Id Tag"),
+    argLength(1430),
+    tagField(1431, "IP Ssp Capabilities Tag"),
+    tagField(1481, "Extensions Tag"),
+    // Call Information Report, Call Information Request
+    tagField(1092, "Sequence Tag"),
+    argLength(1093),
+    tagField(1497, "Requested Information List Tag"),
+    argLength(1498),
+    tagField(1545, "Receiving Side ID Tag"),
+    tagField(1098, "Sequence Tag"),
+    argLength(1099),
+    tagField(1522, "Request Info. Type List Tag"),
+    argLength(1523),
+    tagField(1549, "Party to Charge Tag"),
+    // Cancel
+    enumField(1103, "Choice", names::kCancelChoice).display(names::kCancelChoiceShown),
+    argLength(1530),
+    unsignedField(1531, "Invoke Id").indented(),
+    argLength(1528),
+    argLength(4206),
+    tagField(1529, "Invoke Id Tag"),
+    tagField(4178, "CallSegmentID Tag"),
+    // Connect
+    tagField(1105, "Sequence Tag"),
+    argLength(1106),
+    tagField(1830, "Destination Routing Address Tag"),
+    argLength(1831),
+    tagField(1614, "Called Party Number Tag"),
+    tagField(1125, "Alerting Pattern Tag"),
+    tagField(1640, "Original Called Party Id Tag"),
+    tagField(1952, "Carrier Tag"),
+    tagField(1632, "Calling Partys Category Tag"),
+    tagField(1812, "Redirecting Party Id Tag"),
+    tagField(1824, "Redirection Information Tag"),
+    tagField(2008, "Generic Numbers Tag"),
+    tagField(1957, "Service Interaction Ind Two Tag"),
+    tagField(1939, "Charge Number Tag"),
+    tagField(1946, "CUG Interlock Tag", 16),
+    tagField(1950, "CUG Outgoing Access Tag", 16),
+    tagField(2013, "Suppression Of Announcement Tag", 16),
+    tagField(2014, "OCSI applicable", 16),
+    tagField(2015, "NA Oli Info Tag", 16),
+    tagField(4326, " bor_InterrogationRequested Tag", 16),
+    argLength(4327),
+    // Connect to Resource
+    tagField(1129, "Sequence Tag"),
+    argLength(1130),
+    enumField(1532, "Resource Address(choice)", names::kResourceAddress)
+        .display(names::kResourceAddressShown),
+    argLength(1534),
+    tagField(4179, "CallSegmentID Tag", 16),
+    // Continue With Argument
+    tagField(1241, "Sequence Tag"),
+    argLength(1242),
+    tagField(1945, "CUG Interlock Tag"),
+    tagField(1949, "CUG Outgoing Access Tag"),
+    tagField(1940, "Charge Number Tag", 16),
+    tagField(1953, "Carrier Tag", 16),
+    tagField(4329, "suppress_O_CSI Tag", 16),
+    argLength(4330),
+    tagField(4209, "ContinueWithArgumentArgExtension Tag", 16),
+    argLength(4210),
+    // Establish Temporary Connection
+    tagField(1134, "Sequence Tag"),
+    argLength(1135),
+    tagField(1536, "Assisting Ssp IP Routing Address Tag"),
+    argLength(1537),
+    tagField(1427, "Correlation Id Tag"),
+    argLength(1428),
+    tagField(1538, "SCF ID Tag"),
+    // Event Report BCSM
+    tagField(1144, "Sequence Tag"),
+    argLength(1145),
+    tagField(1555, "Event Type BCSM Tag"),
+    tagField(1558, "Event Specific Info BCSM Tag"),
+    tagField(1602, "Misc Call Info Tag"),
+    // Initial DP
+    tagField(1159, "Sequence Tag"),
+    argLength(1160),
+    tagField(1609, "Service Key Tag"),
+    tagField(1612, "Calling Party Number Tag"),
+    tagField(1635, "Cg Encountered Tag"),
+    tagField(1638, "Location Number Tag"),
+    tagField(1671, "High Layer Compatibility Tag"),
+    tagField(1686, "Add. Calling Party No. Tag"),
+    argLength(1687),
+    tagField(1698, "Bearer Capability Tag"),
+    tagField(1474, "Cause Tag"),
+    tagField(1958, "Service Interaction Ind Two Tag", 16),
+    tagField(1191, "CUG Index Tag", 16),
+    tagField(2018, "IMSI Tag", 16),
+    tagField(2110, "Subscriber State Tag", 16),
+    argLength(2111),
+    tagField(2031, "Location Information Tag", 16),
+    tagField(2125, "Ext Basic Service Code Tag", 16),
+    argLength(2126),
+    tagField(2133, "Call Reference Number Tag", 16),
+    argLength(2134),
+    digitsField(2135, "Call Reference Number Value").indented(),
+    tagField(2159, "SMS MSC Address Tag", 16),
+    tagField(2137, "Called Party Bcd Number Tag", 16),
+    tagField(2230, "Timeand Timezone Tag", 16),
+    tagField(1194, "Gsm Forwarding Pending Tag", 16),
+    argLength(1195),
+    tagField(1196, "Initial DP Arg Extension Tag", 16),
+    argLength(1197),
+    // Release Call, Request Report BCSM Event, Reset Timer
+    tagField(1224, "Sequence Tag"),
+    argLength(1225),
+    tagField(1897, "BCSM Events Tag"),
+    argLength(1898),
+    tagField(1228, "Sequence Tag"),
+    argLength(1229),
+    tagField(2304, "Timer Id Tag").indented(),
+    tagField(1374, "Timer Value Tag").indented(),
+    // Disconnect Forward Connection With Argument, Initiate Call Attempt
+    tagField(4140, "DisconnectForwardConnectionWithArgumentArg Tag"),
+    argLength(4141),
+    tagField(4144, "InitiateCallAttemptArg Tag"),
+    argLength(4145),
+    tagField(1541, "Leg ID Tag"),
+    tagField(4175, "CallReferenceNumber Tag", 16),
+    argLength(4176),
+    digitsField(4177, "Call Reference Number Value").indented(),
+    tagField(4333, "suppress_T_CSI Tag", 16),
+    argLength(4334),
+    // Disconnect Leg, Move Leg, Split Leg, Entity Released
+    tagField(4153, "Disconnect Leg Arg Tag"),
+    argLength(4154),
+    tagField(4158, "Move Leg Arg Tag"),
+    argLength(4159),
+    tagField(4161, "SplitLegArg Tag"),
+    argLength(4162),
+    enumField(4164, "EntityReleased Type", names::kEntityReleasedType),
+    argLength(4165),
+
+    // ==== Call-control types (cap/call_control.cpp): fields in decoding order
+
+    // ==== Party numbers and ISUP / Q.931 parameters (cap/party_numbers.cpp):
+    // ==== fields in decoding order
+
+    // ==== Mobile identities, location and time (cap/mobile.cpp): fields in
+    // ==== decoding order
+
     // Return Result (Last), Return Error, Reject
     tagField(3669, "Return Result (Last)").key(27, KeyForm::Octet),
     blockLength(3670),
@@ -213,14 +364,45 @@ constexpr bool sameText(const char *a, const char *b) {
 }
 } // namespace detail
 
-// The display id of a field: the id of the first catalogue entry whose label
-// equals the field's label with leading blanks ignored.
-constexpr uint32_t displayIdOf(uint32_t id) {
-    const char *label = detail::skipBlanks(kFields[fieldIndex(id)].label);
-    for (size_t i = 0; i < kFieldCount; ++i)
-        if (detail::sameText(detail::skipBlanks(kFields[i].label), label))
-            return kFields[i].id;
-    return id;
+// A field's position in the catalogue, as units and member tables hold it.
+using FieldIndex = uint16_t;
+static_assert(kFieldCount < 0xFFFF, "field positions are 16-bit");
+inline constexpr FieldIndex kNoField = 0xFFFF;
+
+// The display id of every field, by catalogue position: the id of the first
+// catalogue entry whose label equals the field's label with leading blanks
+// ignored.
+struct DisplayIds {
+    uint32_t id[kFieldCount];
+};
+constexpr DisplayIds computeDisplayIds() {
+    DisplayIds out{};
+    for (size_t i = 0; i < kFieldCount; ++i) {
+        const char *label = detail::skipBlanks(kFields[i].label);
+        out.id[i] = kFields[i].id;
+        for (size_t j = 0; j < i; ++j)
+            if (detail::sameText(detail::skipBlanks(kFields[j].label), label)) {
+                out.id[i] = kFields[j].id;
+                break;
+            }
+    }
+    return out;
+}
+inline constexpr DisplayIds kDisplayIds = computeDisplayIds();
+
+constexpr uint32_t displayIdOf(uint32_t id) { return kDisplayIds.id[fieldIndex(id)]; }
+
+namespace detail {
+inline void fieldIdNotDeclared() {} // not constexpr: using it stops compilation
+} // namespace detail
+
+// The catalogue position of a declared field id, for tables built at
+// compile time; an undeclared id does not compile.
+consteval FieldIndex fx(uint32_t id) {
+    const size_t i = fieldIndex(id);
+    if (i >= kFieldCount)
+        detail::fieldIdNotDeclared();
+    return static_cast<FieldIndex>(i);
 }
 
 constexpr bool idsAreUnique() {
@@ -236,8 +418,9 @@ static_assert(idsAreUnique(), "a field id is declared twice");
 template <uint32_t Id>
 struct Field {
     static_assert(fieldIndex(Id) < kFieldCount, "field id is not declared in kFields");
-    static constexpr const FieldDef &def = kFields[fieldIndex(Id)];
-    static constexpr uint32_t displayId = displayIdOf(Id);
+    static constexpr FieldIndex index = static_cast<FieldIndex>(fieldIndex(Id));
+    static constexpr const FieldDef &def = kFields[index];
+    static constexpr uint32_t displayId = kDisplayIds.id[index];
 };
 
 } // namespace camel

@@ -64,3 +64,21 @@ inline constexpr ValueName kOperation[] = {
 };
 
 } // namespace camel::names
+
+namespace camel::names {
+
+// Cancel: the alternative's identifier.
+inline constexpr ValueName kCancelChoice[] = {
+    {0x80, "Invoke Tag"}, {0x81, "All RequestsTAG"}, {0xA2, "Call Segment To Cancel"}};
+inline constexpr ValueName kCancelChoiceShown[] = {{0x80, "Invoke Id"}, {0x81, "All Requests"}};
+
+// Connect to Resource: the resource address alternative.
+inline constexpr ValueName kResourceAddress[] = {{0x80, "IP Routing Address Tag"},
+                                                 {0x83, "None (null Tag)"}};
+inline constexpr ValueName kResourceAddressShown[] = {{0x80, "IP Routingaddress"}, {0x83, "None"}};
+
+// Entity Released: the alternative's identifier.
+inline constexpr ValueName kEntityReleasedType[] = {{0xA0, "callSegmentFailure"},
+                                                    {0xA1, "bCSM_Failure"}};
+
+} // namespace camel::names
