@@ -1,5 +1,7 @@
 #include "support/harness.h"
 
+#include "fields/field_table.h"
+
 #include "../../tools/dpx-decode/key_layout.h"
 
 #include <gtest/gtest.h>
@@ -200,6 +202,10 @@ Decoded decode(const Bytes &message) {
     for (size_t i = 0; i < d.fields.size() && i < d.shown.size(); ++i) {
         const std::string &text = d.fields[i].text;
         const std::string &value = d.shown[i].text;
+        // A field with display names of its own may show another name.
+        const size_t at = camel::fieldIndex(d.fields[i].id);
+        if (at < camel::kFieldCount && camel::kFields[at].displayNameCount != 0)
+            continue;
         EXPECT_TRUE(text.size() >= value.size() &&
                     text.compare(text.size() - value.size(), value.size(), value) == 0)
             << "display text '" << value << "' does not end the field text '" << text << "'";
