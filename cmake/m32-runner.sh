@@ -38,7 +38,8 @@ else
 fi
 
 path=$(command -v "$emulator") || {
-    echo "m32: $why $emulator is not installed (make deps installs qemu-user)" >&2
+    [ "$emulator" = qemu-i386 ] && hint=" (make deps installs qemu-user)" || hint=
+    echo "m32: $why $emulator is not installed$hint" >&2
     exit 2
 }
 case $path in /*) ;; *) path=$PWD/$path ;; esac
