@@ -1,6 +1,7 @@
 # Set-up, build and test entry points (see README.md, "Build and set-up").
 #
-#   make deps    install the Debian packages the build needs (root or sudo)
+#   make deps    install the Debian packages the build needs (root or sudo),
+#                qemu-user too where 32-bit x86 programs do not run natively
 #   make build   configure and build the native preset (build/native)
 #   make demo    deps + build, then decode the bundled sample messages
 #   make test    deps, then build and test the native, asan and m32 presets
