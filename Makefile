@@ -1,6 +1,7 @@
 # Set-up, build and test entry points (see README.md, "Build and set-up").
 #
-#   make deps    install the Debian packages the build needs (root or sudo)
+#   make deps    install the Debian packages the build needs (root or sudo),
+#                qemu-user too where 32-bit x86 programs do not run natively
 #   make build   configure and build the native preset (build/native)
 #   make demo    deps + build, then decode the bundled sample messages
 #   make test    deps, then build and test the native, asan and m32 presets
@@ -14,6 +15,17 @@ PRESETS := native asan m32
 DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
                 libbenchmark-dev nlohmann-json3-dev libcli11-dev tshark python3
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
+APT_INSTALL := $(SUDO) apt-get update -qq; \
+               $(SUDO) env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends
+
+# How the m32 programs run: natively where the kernel executes 32-bit x86
+# programs, else under qemu-i386 (Debian qemu-user).  DPX_M32_EMULATOR=PROG
+# (environment or make command line) runs them under PROG on any machine.
+DPX_M32_EMULATOR ?=
+M32_RUNNER := sh cmake/m32-runner.sh "$(DPX_M32_EMULATOR)"
+# Shell: sets $$m32 (how they run), or says in one line why they cannot run.
+M32_CHECK := m32=$$($(M32_RUNNER) 2>&1) || { echo "make test: $$m32" >&2; exit 1; }; \
+             [ "$$m32" = native ] && m32=natively || m32="under $$m32"
 
 SAMPLES := $(sort $(wildcard samples/*.txt))
 DEMO_ARGS ?= $(SAMPLES)
@@ -30,9 +42,14 @@ deps:
 	    echo "make deps: installing$$missing"; \
 	    echo "wireshark-common wireshark-common/install-setuid boolean false" \
 	        | $(SUDO) debconf-set-selections; \
-	    $(SUDO) apt-get update -qq; \
-	    $(SUDO) env DEBIAN_FRONTEND=noninteractive \
-	        apt-get install -y -qq --no-install-recommends $$missing; \
+	    $(APT_INSTALL) $$missing; \
+	fi
+	@# Only now can gcc -m32 link (g++-multilib); exit status 2: built, not run.
+	@$(M32_RUNNER) >/dev/null 2>&1; \
+	if [ $$? = 2 ] && ! command -v qemu-i386 >/dev/null \
+	    && case "$(DPX_M32_EMULATOR)" in ""|qemu-i386) true ;; *) false ;; esac; then \
+	    echo "make deps: no 32-bit x86 execution here: installing qemu-user"; \
+	    $(APT_INSTALL) qemu-user; \
 	fi
 
 build:
@@ -49,14 +66,16 @@ demo: deps build
 test: deps
 	@for preset in $(PRESETS); do \
 	    echo "==== $$preset ===="; \
+	    if [ "$$preset" = m32 ]; then $(M32_CHECK); fi; \
 	    cmake --preset "$$preset" \
 	        && cmake --build --preset "$$preset" \
 	        && ctest --preset "$$preset" \
 	        || { echo "make test: $$preset FAILED" >&2; exit 1; }; \
 	done; \
-	echo "make test: $(PRESETS) passed"
+	echo "make test: $(PRESETS) passed$${m32:+ (m32 programs run $$m32)}"
 
 $(addprefix test-,$(PRESETS)): test-%:
+	@if [ $* = m32 ]; then $(M32_CHECK); echo "m32 programs run $$m32"; fi
 	cmake --preset $*
 	cmake --build --preset $*
 	ctest --preset $*
@@ -87,9 +106,7 @@ fuzz: deps
 	done; \
 	if [ -n "$$missing" ]; then \
 	    echo "make fuzz: installing$$missing"; \
-	    $(SUDO) apt-get update -qq; \
-	    $(SUDO) env DEBIAN_FRONTEND=noninteractive \
-	        apt-get install -y -qq --no-install-recommends $$missing; \
+	    $(APT_INSTALL) $$missing; \
 	fi
 	cmake --preset fuzz
 	cmake --build --preset fuzz

@@ -581,6 +581,7 @@ def main(argv=None):
     ap = argparse.ArgumentParser(description=__doc__.split('\n')[0])
     ap.add_argument('--decoder', default=str(repo / 'build' / 'native' / 'dpx-decode'),
                     help='dpx-decode executable')
+    ap.add_argument('--emulator', help='run dpx-decode under this program (e.g. qemu-i386)')
     ap.add_argument('--tools', default=os.environ.get('DPX_REFERENCE_TOOLS',
                                                       str(repo.parent / 'shared' / 'tools')),
                     help='folder holding capgen.py and oracle.py')
@@ -604,6 +605,7 @@ def main(argv=None):
     if not os.access(args.decoder, os.X_OK):
         print('FAILED: decoder %s not found' % args.decoder)
         return 1
+    decoder = [args.emulator, args.decoder] if args.emulator else [args.decoder]
     sys.path.insert(0, str(tools))
     sys.dont_write_bytecode = True     # leave the shared tools folder as it is
     import capgen  # noqa: E402 (found only at run time)
@@ -622,9 +624,9 @@ def main(argv=None):
         jobs = {
             'oracle.py': [sys.executable, str(tools / 'oracle.py'), str(src), '--jsonl', '-q',
                           '--no-hex', '--tshark', args.tshark, '-o', str(ora_out)],
-            'dpx-decode (corpus)': [args.decoder, '--format', 'json', '--pass', 'md', str(src)],
-            'dpx-decode (mutated)': [args.decoder, '--format', 'json',
-                                     '--pass', 'md,display,view,keys', str(msrc)],
+            'dpx-decode (corpus)': decoder + ['--format', 'json', '--pass', 'md', str(src)],
+            'dpx-decode (mutated)': decoder + ['--format', 'json',
+                                               '--pass', 'md,display,view,keys', str(msrc)],
         }
         outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out}
         procs = {}

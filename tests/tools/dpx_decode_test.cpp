@@ -80,10 +80,13 @@ std::string tempFile(const std::string &name, const std::string &content) {
     return path;
 }
 
-// Runs dpx-decode with `args` (quoted as needed), standard input from `input`.
+// Runs dpx-decode with `args` (quoted as needed), standard input from `input`;
+// under the build's emulator where this machine cannot execute its programs.
 Outcome run(const std::string &args, const std::string &input = "") {
     const std::string errPath = tempFile("stderr", "");
-    const std::string command = quote(DPX_BUILD_DIR "/dpx-decode") + " " + args + " <" +
+    const std::string emulator = DPX_TEST_EMULATOR;
+    const std::string command = (emulator.empty() ? "" : quote(emulator) + " ") +
+                                quote(DPX_BUILD_DIR "/dpx-decode") + " " + args + " <" +
                                 quote(tempFile("stdin", input)) + " 2>" + quote(errPath);
     Outcome r;
     FILE *p = popen(command.c_str(), "r");
