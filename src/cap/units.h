@@ -81,4 +81,7 @@ CAMEL_DECLARE_UNIT(decodeRequestAnnounceComplete);
 CAMEL_DECLARE_UNIT(decodeRequestAnnouncementStartedNotification);
 CAMEL_DECLARE_UNIT(decodeCollectInfo);
 
+// ---- Charging, call gap and information to send
+CAMEL_DECLARE_UNIT(decodeGenericDigits);            // after "Type Of Digits": scheme and digits
+
 } // namespace camel

@@ -10,6 +10,7 @@
 
 #include "fields/field_def.h"
 #include "fields/names_cap.h"
+#include "fields/names_results.h"
 #include "fields/names_tcap.h"
 
 namespace camel {
@@ -259,12 +260,49 @@ inline constexpr FieldDef kFields[] = {
 
     // ==== Mobile identities, location and time (cap/mobile.cpp): fields in
     // ==== decoding order
+    tagField(4190, "SupportedCamelPhases Tag").indented(),
+    argLength(4191),
+    digitsField(4192, "SupportedCamelPhases Info").indented(),
+    tagField(4193, "OfferedCamel4Functionalities Tag").indented(),
+    argLength(4194),
+    digitsField(4195, "OfferedCamel4Functionalities Info").indented(),
 
     // Return Result (Last), Return Error, Reject
     tagField(3669, "Return Result (Last)").key(27, KeyForm::Octet),
     blockLength(3670),
+    // The result of a Return Result (Last)
+    tagField(3677, "Sequence Tag"),
+    blockLength(3678),
+    octetLength(3684),
+    enumField(1068, "Operation ID(RetRes)", names::kResultOperation).key(22, KeyForm::Octet),
+    enumField(1918, "Choice", names::kReceivedInformation).indented(),
+    headerLength(1917),
+    enumField(1647, "Type Of Digits", names::kTypeOfDigits, 5).indented().otherwise("Spare"),
+    tagField(4169, "initiateCallAttemptRes Tag").indented(),
+    argLength(4170),
     tagField(3685, "Return Error").key(28, KeyForm::Octet),
     blockLength(3686),
+    // The error code and parameter of a Return Error
+    enumField(3692, "Error Code Tag", names::kErrorCodeTag),
+    octetLength(3693),
+    enumField(1070, "Error Code", names::kErrorCode).key(23, KeyForm::Octet),
+    tagField(1920, "Sequence Tag").indented(),
+    argLength(1921),
+    tagField(1922, "Problem Tag").indented(),
+    argLength(1923),
+    enumField(1924, "Problem", names::kCancelProblem).indented(),
+    tagField(1925, "Operation Tag").indented(),
+    argLength(1926),
+    unsignedField(1927, "Invoke Id").indented(),
+    tagField(1928, "Requested Parameter Tag"),
+    argLength(1929),
+    enumField(1930, "Value", names::kRequestedInfoError).indented(),
+    tagField(1931, "Parameter Tag").indented(),
+    argLength(1933),
+    enumField(1934, "Unavailable Network Resource", names::kUnavailableNetworkResource).indented(),
+    tagField(1935, "Parameter Tag").indented(),
+    argLength(1936),
+    enumField(1937, "Parameter Value", names::kTaskRefused).indented(),
     tagField(3694, "Reject"),
     blockLength(3695),
     enumField(3701, "  Problem Code", names::kProblemType),

@@ -115,8 +115,6 @@ int decodeInvoke(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Request<P
         [&](ElementContext *c, uint32_t e) { return decodeOperation<P>(st, c, e, rq); });
 }
 
-// The result that may follow the invoke id is not decoded yet; in the
-// definite form its octets are skipped as left-over bits of the window.
 template <Pass P>
 int decodeReturnResultLast(DecodeState *st, ElementContext *ctx, uint32_t inEoc,
                            Request<P> *rq) {
@@ -124,18 +122,18 @@ int decodeReturnResultLast(DecodeState *st, ElementContext *ctx, uint32_t inEoc,
         return 1;
     return decodeComponentBody<P, 3669, 3670>(
         st, ctx, "Return Result (Last)", rq,
-        [&](ElementContext *c, uint32_t e) { return decodeInvokeId<P>(st, c, e, rq); });
+        [&](ElementContext *c, uint32_t e) { return decodeInvokeId<P>(st, c, e, rq); },
+        [&](ElementContext *c, uint32_t e) { return decodeResult<P>(st, c, e, rq); });
 }
 
-// The error code and parameter after the invoke id are not decoded yet;
-// in the definite form they are skipped as left-over bits of the window.
 template <Pass P>
 int decodeReturnError(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Request<P> *rq) {
     if (ctx->present == 0 || (inEoc != 0 && ctx->eocSeen != 0) || !tagTest(st, 0xA3))
         return 1;
     return decodeComponentBody<P, 3685, 3686>(
         st, ctx, "Return Error Component", rq,
-        [&](ElementContext *c, uint32_t e) { return decodeInvokeId<P>(st, c, e, rq); });
+        [&](ElementContext *c, uint32_t e) { return decodeInvokeId<P>(st, c, e, rq); },
+        [&](ElementContext *c, uint32_t e) { return decodeError<P>(st, c, e, rq); });
 }
 
 template <Pass P>

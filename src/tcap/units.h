@@ -31,4 +31,13 @@ int decodeComponentPortion(DecodeState *st, ElementContext *ctx, Request<P> *rq)
 template <Pass P>
 int decodeOperationCodeTag(DecodeState *st, ElementContext *ctx, Request<P> *rq);
 
+// The optional result SEQUENCE of a Return Result (Last), after its invoke
+// id; inEoc is 1 when the component has the indefinite form.
+template <Pass P>
+int decodeResult(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Request<P> *rq);
+
+// The error code and parameter of a Return Error, after its invoke id.
+template <Pass P>
+int decodeError(DecodeState *st, ElementContext *ctx, uint32_t inEoc, Request<P> *rq);
+
 } // namespace camel
