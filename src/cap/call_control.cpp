@@ -378,21 +378,16 @@ constexpr Member kEventSpecificInfoBcsm =
 
 // ---- The units ------------------------------------------------------------------------------
 
-// A unit that decodes one body row from its length field on.
-#define CAMEL_BODY_UNIT(unit, row)                                                         \
+// A unit decoded by `decode` (decodeBody for a body row from its length
+// field on, walkTable for a table walked after the length) over `what`.
+#define CAMEL_TYPE_UNIT(unit, decode, what)                                                \
     template <Pass P>                                                                      \
     int unit(DecodeState *st, ElementContext *ctx, Request<P> *rq) {                       \
-        return decodeBody<P>(st, ctx, rq, row);                                            \
+        return decode<P>(st, ctx, rq, what);                                               \
     }                                                                                      \
     CAMEL_INSTANTIATE_UNIT(unit, DecodeState *, ElementContext *)
-
-// A unit called after its length: the table walks the rest of the window.
-#define CAMEL_TABLE_UNIT(unit, membersTable)                                               \
-    template <Pass P>                                                                      \
-    int unit(DecodeState *st, ElementContext *ctx, Request<P> *rq) {                       \
-        return walkTable<P>(st, ctx, rq, membersTable);                                    \
-    }                                                                                      \
-    CAMEL_INSTANTIATE_UNIT(unit, DecodeState *, ElementContext *)
+#define CAMEL_BODY_UNIT(unit, row) CAMEL_TYPE_UNIT(unit, decodeBody, row)
+#define CAMEL_TABLE_UNIT(unit, table) CAMEL_TYPE_UNIT(unit, walkTable, table)
 
 CAMEL_BODY_UNIT(decodeExtensions, kExtensions);
 CAMEL_BODY_UNIT(decodeSendingSideId, kSendingSideId);
