@@ -9,6 +9,7 @@
 #include <cstdint>
 
 #include "fields/field_def.h"
+#include "fields/names_call_control.h"
 #include "fields/names_cap.h"
 #include "fields/names_results.h"
 #include "fields/names_tcap.h"
@@ -254,6 +255,214 @@ inline constexpr FieldDef kFields[] = {
     argLength(4165),
 
     // ==== Call-control types (cap/call_control.cpp): fields in decoding order
+    // IP SSP capabilities
+    argLength(1432),
+    enumField(1433, "IP Routing Address Support", names::kSupported, 1).indented(),
+    enumField(1434, "Voiceback", names::kSupported, 1).indented(),
+    enumField(1435, "Voiceinformation Via Speech", names::kVoiceViaSpeech, 1).indented(),
+    enumField(1436, "Voiceinformation Via Voice", names::kVoiceViaVoice, 1).indented(),
+    enumField(1437, "Generation Of Voice Announ", names::kSupported, 1).indented(),
+    enumField(1438, "End Of Standard Part", names::kEndOfStandardPart, 1).indented(),
+    hexField(1439, "Bilateral Part", 0).indented(),
+    // Extensions
+    argLength(1482),
+    tagField(1484, "Extension Field Tag"),
+    argLength(1485),
+    tagField(1487, "Extension Type Tag"),
+    argLength(1488),
+    digitsField(1489, "Extension Type Info").indented(),
+    tagField(1490, "Extension Criticality Tag"),
+    argLength(1491),
+    enumField(1492, "Extension Criticality Value", names::kExtensionCriticality).indented(),
+    enumField(1493, "Extension Val Tag", names::kExtensionValueTag),
+    argLength(1495),
+    digitsField(1496, "Extension Val Info").indented(),
+    // Requested information list
+    tagField(1500, "Requested Information Tag"),
+    argLength(1501),
+    tagField(1502, "Request Info Type Tag"),
+    argLength(1503),
+    enumField(1504, "Request Info Type Data", names::kRequestedInfoType).indented(),
+    tagField(1505, "Requested Information Value Tag"),
+    argLength(1506),
+    enumField(1507, "Choice", names::kRequestedInfoValueChoice)
+        .display(names::kRequestedInfoValueChoiceShown),
+    argLength(1509),
+    unsignedField(1510, "Call Att Elaps Time Value Data").indented(),
+    argLength(1511),
+    hexField(1512, "Year", 16).indented(),
+    hexField(1513, "Month"),
+    hexField(1514, "Day"),
+    hexField(1515, "Hour"),
+    hexField(1516, "Minute"),
+    hexField(1517, "Second"),
+    argLength(1518),
+    unsignedField(1519, "Call Connect Elapsed Time Value Data(100 milliseconds)", 0).indented(),
+    // Receiving Side ID, and the side id that ends every side and leg id
+    argLength(1546),
+    enumField(1547, "Choice", names::kReceivingSideChoice),
+    argLength(1553),
+    enumField(1554, "Side Id Value", names::kLegType).indented(),
+    // Requested information type list, Sending Side Id
+    tagField(1525, "Requested Information Type Tag"),
+    argLength(1526),
+    enumField(1527, "Requested Information Type ", names::kRequestedInfoType).indented(),
+    argLength(1550),
+    enumField(1551, "Choice", names::kSendingSideChoice),
+    // Call Segment ID
+    argLength(4180),
+    digitsField(4181, "Call Segment ID").indented(),
+    // Service interaction indicators two
+    argLength(1959),
+    tagField(1969, "Forward service interaction ind"),
+    argLength(1970),
+    tagField(1975, "Conference Treatment Indicator Tag"),
+    argLength(1976),
+    enumField(1977, "Conference Treatment Indicator", names::kConferenceTreatment)
+        .display(names::kConferenceTreatmentShown)
+        .indented(),
+    tagField(1978, "Call Diversion Treatment Ind Tag"),
+    argLength(1979),
+    enumField(1980, "Call Diversion Treatment Ind", names::kCallDiversionTreatment)
+        .display(names::kCallDiversionTreatmentShown)
+        .indented(),
+    tagField(1981, "Calling Party Restriction Ind Tag"),
+    argLength(1982),
+    enumField(1983, "Calling Party Restriction Ind", names::kCallingPartyRestriction).indented(),
+    tagField(1984, "Backward service interaction ind"),
+    argLength(1985),
+    tagField(1988, "Call Completion Treatment Ind Tag"),
+    argLength(1989),
+    enumField(1990, "Call Completion Treatment Ind", names::kCallCompletionTreatment)
+        .display(names::kCallCompletionTreatmentShown)
+        .indented(),
+    tagField(1991, "Bothway through connection Ind"),
+    argLength(1992),
+    enumField(1993, "Bothway Through Connection Ind", names::kBothwayThroughConnection).indented(),
+    tagField(1994, "Connected number treatment ind"),
+    argLength(1995),
+    enumField(1996, "Connected Number Treatment Ind", names::kConnectedNumberTreatment, 2)
+        .indented(),
+    tagField(1997, "Non CUG Call Tag"),
+    argLength(1998, "LENGTH(null)"),
+    tagField(1999, "Hold Treatment Indicator Tag", 16),
+    argLength(2000),
+    enumField(2001, "Hold Treatment Indicator", names::kHoldTreatment, 2)
+        .display(names::kHoldTreatmentShown)
+        .indented(),
+    tagField(2002, "Cw Treatment Indicator Tag", 16),
+    argLength(2003),
+    enumField(2004, "Cw Treatment Indicator", names::kCwTreatment, 2).indented(),
+    tagField(2005, "Ect Treatment Indicator Tag", 16),
+    argLength(2006),
+    enumField(2007, "Ect Treatment Indicator", names::kEctTreatment, 2).indented(),
+    // CUG data, the "None" NULL, NA Oli Info
+    argLength(1947),
+    hexField(1948, "CUG Interlock", 0).indented(),
+    argLength(1951, "LENGTH(null)"),
+    argLength(1535),
+    argLength(2016),
+    hexField(2017, "NA Oli Info Value").indented(),
+    // Continue With Argument Arg Extension, Leg Or Call Segment, Leg ID
+    tagField(4182, "suppress_D_CSI Tag"),
+    argLength(4183),
+    tagField(4184, "suppress_N_CSI Tag"),
+    argLength(4185),
+    tagField(4211, "suppressOutgoingCallBarring Tag"),
+    argLength(4212),
+    tagField(4186, "LegOrCallSegment Tag"),
+    argLength(4187),
+    enumField(4188, "LegOrCallSegment Type", names::kLegOrCallSegment),
+    argLength(1542),
+    enumField(1543, "Choice", names::kLegIdChoice).display(names::kLegIdChoiceShown).indented(),
+    // SCF Id
+    argLength(1539),
+    digitsField(1540, "SCF ID Value"),
+    // Event Type BCSM
+    argLength(1556),
+    enumField(1557, "Event Type BCSM Value", names::kEventTypeBcsm)
+        .indented()
+        .key(13, KeyForm::Octet),
+    // Event Specific Info BCSM
+    argLength(1559),
+    enumField(1563, "Choice", names::kEventSpecificInfoChoice)
+        .display(names::kEventSpecificInfoChoiceShown),
+    enumField(1565, "Choice", names::kEventSpecificInfoChoice16, 16)
+        .display(names::kEventSpecificInfoChoice16Shown),
+    argLength(1560),
+    tagField(1615, "Called Party Number Tag", 16),
+    tagField(1575, "Or Call Tag", 16),
+    argLength(1576, "LENGTH(null)"),
+    tagField(1577, "Forwarded call", 16),
+    argLength(1578, "LENGTH(null)"),
+    tagField(4280, "ChargeIndicator Tag", 16),
+    argLength(4281),
+    enumField(4282, "Charge Indicator", names::kChargeIndicator, 2).indented(),
+    hexField(4283, "Spare", 6).indented(),
+    // Ext Basic Service Code
+    enumField(2127, "Choice", names::kExtBasicServiceChoice)
+        .display(names::kExtBasicServiceChoiceShown),
+    argLength(2128),
+    enumField(2053, "Bs Code", names::kBearerService).indented(),
+    digitsField(2129, "Reserved Bs Code").indented(),
+    argLength(2130),
+    enumField(2057, "Ts Code", names::kTeleService).display(names::kTeleServiceShown).indented(),
+    digitsField(2131, "Reserved Ts Code").indented(),
+    // (event-specific information, continued)
+    tagField(1579, "Release Cause Tag"),
+    tagField(1600, "Call forwarded", 16),
+    argLength(1601, "LENGTH(null)"),
+    tagField(1580, "Route Not Permitted Tag", 16),
+    argLength(2606, "LENGTH(null)"),
+    tagField(1581, "LocationInformation Tag", 16),
+    argLength(1582),
+    digitsField(1583, "LocationInformation Info").indented(),
+    tagField(1584, "routeNotPermitted Tag", 16),
+    argLength(1585, "LENGTH(null)"),
+    // Misc Call Info
+    argLength(1603),
+    tagField(1606, "Message Type Tag"),
+    argLength(1607),
+    enumField(1608, "Message Type", names::kMiscMessageType).indented(),
+    // Service Key, Cg Encountered
+    argLength(1610),
+    unsignedField(1611, "Service Key", 0).indented(),
+    argLength(1636),
+    enumField(1637, "Type of CG (Call Gapping) encountered", names::kCgEncountered).indented(),
+    // BCSM events
+    tagField(1900, "BCSM Event Tag"),
+    argLength(1901),
+    tagField(1907, "Monitor Mode Tag"),
+    argLength(1908),
+    enumField(1909, "Monitor Mode Data", names::kMonitorMode).indented(),
+    tagField(1910, "DP Specific Criteria Tag"),
+    argLength(1911),
+    enumField(1912, "Choice", names::kDpSpecificCriteriaChoice)
+        .display(names::kDpSpecificCriteriaChoiceShown),
+    argLength(1915),
+    unsignedField(1916, "Application Timer Value(second)", 0).indented(),
+    argLength(4284),
+    tagField(4292, "minimumNumberOfDigits Tag"),
+    argLength(4293),
+    unsignedField(4294, "minimumNumberOfDigits").indented(),
+    tagField(4295, "maximumNumberOfDigits Tag"),
+    argLength(4296),
+    unsignedField(4297, "maximumNumberOfDigits").indented(),
+    tagField(4301, "endOfReplyDigit Tag"),
+    argLength(4302),
+    digitsField(4303, "endOfReplyDigit").indented(),
+    tagField(4304, "cancelDigit Tag"),
+    argLength(4305),
+    digitsField(4306, "cancelDigit").indented(),
+    tagField(4307, "startDigit Tag"),
+    argLength(4308),
+    digitsField(4309, "startDigit").indented(),
+    tagField(4298, "interDigitTimeout Tag"),
+    argLength(4299),
+    unsignedField(4300, "interDigitTimeout (in seconds)").indented(),
+    argLength(4310),
+    tagField(4331, "automaticRearm Tag", 16),
+    argLength(4332, "LENGTH(null)"),
 
     // ==== Party numbers and ISUP / Q.931 parameters (cap/party_numbers.cpp):
     // ==== fields in decoding order
