@@ -12,6 +12,7 @@
 #include "fields/names_call_control.h"
 #include "fields/names_cap.h"
 #include "fields/names_results.h"
+#include "fields/names_party.h"
 #include "fields/names_tcap.h"
 
 namespace camel {
@@ -466,6 +467,204 @@ inline constexpr FieldDef kFields[] = {
 
     // ==== Party numbers and ISUP / Q.931 parameters (cap/party_numbers.cpp):
     // ==== fields in decoding order
+    // Called Party Number: the address body and the address signal digits
+    argLength(1616),
+    enumField(1819, "Nature Of Address Ind", names::kCalledNatureOfAddress, 7).indented(),
+    enumField(1820, "Odd/even Indicator", names::kOddEven, 1)
+        .indented()
+        .display(names::kCalledOddEvenShown),
+    unsignedField(1821, "Spare", 4),
+    enumField(1822, "Numbering Plan Indicator", names::kNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    enumField(1823, "Internal Network Num Ind", names::kCalledInn, 1),
+    digitsField(3589, "Called Party Num").indented().key(10, KeyForm::Variable),
+    hexField(3590, "Filler", 4),
+    digitsField(3592, "Called Party Num").indented().key(10, KeyForm::Variable),
+    digitsField(3600, "Address Signal").indented().key(12, KeyForm::Variable),
+    hexField(3601, "Filler", 4),
+    digitsField(3603, "Address Signal").indented().key(12, KeyForm::Variable),
+    // Calling Party Number
+    argLength(1613),
+    enumField(1617, "Nature Of Address Ind", names::kNatureOfAddress, 7).indented(),
+    enumField(1618, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(1619, "Screening Indicator", names::kCallingScreening, 2).indented(),
+    enumField(1620, "Pres. Restric. Indicator", names::kPresentation, 2).indented(),
+    enumField(1621, "Numbering Plan Ind", names::kCallingNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    enumField(1622, "Ni Ind", names::kNiIndicator, 1).indented(),
+    digitsField(1628, "Calling Party Num").indented().key(15, KeyForm::Variable),
+    hexField(1629, "Filler", 4),
+    digitsField(1631, "Calling Party Num").indented().key(15, KeyForm::Variable),
+    // Original Called Party Id
+    argLength(1641),
+    enumField(1642, "Nature Of Address Ind", names::kNatureOfAddress, 7).indented(),
+    enumField(1643, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(1644, "Numbering Plan Indicator", names::kNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    enumField(1645, "Pres. Restric. Indicator", names::kOriginalPresentation, 2).indented(),
+    digitsField(1646, "Address Signal In Called").indented(),
+    // Redirecting Party Id
+    argLength(1813),
+    enumField(1814, "Nature Of Address Ind", names::kNatureOfAddress, 7).indented(),
+    enumField(1815, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(1816, "Numbering Plan Indicator", names::kPrivateNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    enumField(1817, "Pres. Restric. Indicator", names::kPresentation, 2).indented(),
+    digitsField(1818, "Address Signal In Redir").indented(),
+    // Redirection Information
+    argLength(1825),
+    enumField(1826, "Redirecting Indicator", names::kRedirectingIndicator, 3).indented(),
+    enumField(1827, "Original Redirection Reasons", names::kOriginalRedirectionReason, 4).indented(),
+    unsignedField(1828, "Redirection Counter", 3).indented(),
+    enumField(1829, "Redirecting Reason", names::kRedirectingReason, 4).indented(),
+    // Charge Number (its digits are the Address Signal fields above)
+    argLength(1941),
+    enumField(1942, "Nature Of Address Ind", names::kChargeNatureOfAddress, 7).indented(),
+    enumField(1943, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(1944, "Numbering Plan Indicator", names::kPrivateNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    // Location Number: the generic address body, location-number layout
+    argLength(1639),
+    enumField(3557, "Nature Of Address Ind", names::kLocationNatureOfAddress, 7)
+        .indented()
+        .display(names::kSpare127Shown),
+    enumField(1661, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(3560, "Screening Indicator", names::kLocationScreening, 2).indented(),
+    enumField(3569, "Numbering Plan Indicator", names::kLocationNumberingPlan, 3).indented(),
+    enumField(3575, "Internal Network Num Ind", names::kLocationInn, 1),
+    enumField(1662, "Pres. Restric. Indicator", names::kPresentation, 2).indented(),
+    digitsField(1663, "Address Signal In Generic").indented(),
+    // Generic Numbers, Generic Number: the generic-number layout
+    argLength(2009),
+    tagField(2011, "Generic Number Tag"),
+    argLength(2012),
+    enumField(1657, "Number Qualifier Indicator", names::kNumberQualifier)
+        .indented()
+        .otherwise("Reserved"),
+    enumField(3554, "Nature Of Address Ind", names::kGenericNatureOfAddress, 7)
+        .indented()
+        .display(names::kSpare127Shown),
+    enumField(3563, "Screening Indicator", names::kGenericScreening, 2).indented(),
+    enumField(3566, "Numbering Plan Indicator", names::kGenericNumberingPlan, 3).indented(),
+    enumField(3572, "Ni Indicator", names::kNiIndicator, 1).indented(),
+    // Additional calling party number
+    enumField(1659, "Number Qualifier Indicator", names::kNumberQualifier)
+        .indented()
+        .otherwise("Reserved"),
+    enumField(1664, "Nature Of Address Ind", names::kAdditionalNatureOfAddress, 7).indented(),
+    enumField(1665, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(1666, "Screening Indicator", names::kGenericScreening, 2).indented(),
+    enumField(1667, "Numbering Plan Indicator", names::kPrivateNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    enumField(1668, "Ni Indicator", names::kNiIndicator, 1).indented(),
+    enumField(1669, "Pres. Restric. Indicator", names::kPresentation, 2).indented(),
+    digitsField(1670, "Address Signal In Anon").indented(),
+    // Calling Partys Category
+    argLength(1633),
+    enumField(1634, "Calling Partys Category", names::kCallingPartysCategory).indented(),
+    // Carrier
+    argLength(1954),
+    enumField(1955, "Carrier Selection", names::kCarrierSelection)
+        .indented()
+        .display(names::kCarrierSelectionShown),
+    hexField(1956, "NA Carrier Id", 0).indented().spanSelector(1),
+    // Alerting Pattern
+    argLength(1126),
+    hexField(1127, "Alerting Pattern(spare)", 16).indented(),
+    enumField(1128, "Type Of Alerting", names::kTypeOfAlerting).indented().otherwise("Reserved"),
+    // Cause
+    argLength(1475),
+    enumField(1476, "Location", names::kCauseLocation, 4)
+        .indented()
+        .display(names::kCauseLocationShown),
+    enumField(1477, "Coding Standard", names::kCauseCodingStandard, 2)
+        .indented()
+        .display(names::kCauseCodingStandardShown),
+    enumField(1480, "Cause Value", names::kCauseValue, 7)
+        .indented()
+        .display(names::kCauseValueShown)
+        .key(8, KeyForm::Octet),
+    enumField(1478, "Extension Indicator", names::kExtensionIndicator, 1).indented(),
+    hexField(1479, "Diagnostics", 0).indented(),
+    // High Layer Compatibility
+    argLength(1672),
+    enumField(1673, "Coding Standard", names::kHlcCodingStandard, 2).indented(),
+    enumField(1675, "Interpretation", names::kHlcInterpretation, 3).indented(),
+    enumField(1676, "Presentation Method", names::kHlcPresentation, 2)
+        .indented()
+        .display(names::kHlcPresentationShown),
+    enumField(1677, "High Layer Charac Identification", names::kHighLayerCharacteristics, 7)
+        .indented()
+        .otherwise("Reserved"),
+    enumField(1678, "Extension Indicator", names::kExtensionIndicator, 1).indented(),
+    enumField(1680, "Interpretation", names::kHlcInterpretation, 3).indented(),
+    enumField(1681, "Presentation Method", names::kHlcPresentation, 2)
+        .indented()
+        .display(names::kHlcPresentationShown),
+    enumField(1682, "Etsi High Layer Char Identi", names::kEtsiHighLayer, 7)
+        .indented()
+        .otherwise("Reserved"),
+    enumField(1683, "Extension Indicator", names::kExtensionIndicator, 1).indented(),
+    enumField(1685, "Extended High Layer", names::kExtendedHighLayer, 7)
+        .indented()
+        .otherwise("Reserved"),
+    // Bearer Capability
+    argLength(1699),
+    enumField(1700, "Choice", names::kBearerChoice).display(names::kBearerChoiceShown),
+    argLength(1702),
+    enumField(1704, "Information Transfer Capability", names::kTransferCapability, 5)
+        .indented()
+        .otherwise("Reserved"),
+    enumField(1705, "Coding Standard", names::kBearerCodingStandard, 2)
+        .indented()
+        .display(names::kBearerCodingStandardShown),
+    enumField(1706, "  Extension Bit", names::kBearerExtension, 1),
+    enumField(1707, "Information Transfer Rate", names::kTransferRate, 5)
+        .indented()
+        .otherwise("Reserved"),
+    enumField(1708, "Transfer Mode", names::kTransferMode, 2).indented(),
+    unsignedField(1712, "  Rate multiplier", 7),
+    enumField(1714, "  Extension Bit", names::kBearerExtension, 1),
+    enumField(1715, "  Layer Id", names::kLayerId, 2).otherwise("Invalid"),
+    hexField(1719, "  Invalid Data", 5),
+    enumField(1725, "  User information layer 1 protocol", names::kLayer1Protocol, 5)
+        .otherwise("Reserved"),
+    enumField(1730, "  Synchronous/Asynchronous", names::kSynchronous, 1),
+    enumField(1729, "  In-band negotiation", names::kInBandNegotiation, 1),
+    enumField(1728, "  User rate", names::kUserRate, 5).otherwise("Reserved"),
+    enumField(1734, "  Intermediate rate", names::kIntermediateRate, 2),
+    enumField(1735, "  Network independent clock on transmission (Tx)", names::kRequired, 1),
+    enumField(1736, "  Network independent clock on reception (Rx)", names::kAccepted, 1),
+    enumField(1737, "  Flow control on transmission (Tx)", names::kRequired, 1),
+    enumField(1738, "  Flow control on reception (Rx)", names::kAccepted, 1),
+    unsignedField(1739, "  Spare", 1),
+    enumField(1742, "  Rate adaption header", names::kRateAdaptionHeader, 1),
+    enumField(1743, "  Multiple frame establishment support in data link", names::kSupported, 1),
+    enumField(1744, "  Mode of operation", names::kModeOfOperation, 1),
+    enumField(1745, "  Logical link identifier negotiation", names::kLliNegotiation, 1),
+    enumField(1746, "  Assignor/assignee", names::kAssignor, 1),
+    enumField(1747, "  In-band/out-band negotiation", names::kNegotiationBand, 1),
+    unsignedField(1748, "  Spare", 1),
+    enumField(1750, "  Parity information", names::kParity, 3).otherwise("Reserved"),
+    enumField(1751, "  Number of data bits excluding parity Bit", names::kDataBits, 2),
+    enumField(1752, "  Number of stop bits", names::kStopBits, 2),
+    enumField(1755, "  Modem type", names::kModemType, 6).otherwise("Reserved"),
+    enumField(1756, "  Mode duplex", names::kDuplex, 1),
+    enumField(1758, "  User information layer 2 protocol", names::kLayer2Protocol, 5)
+        .otherwise("Reserved"),
+    enumField(1760, " User information layer 3 protocol", names::kLayer3Protocol, 5)
+        .otherwise("Reserved"),
+    unsignedField(1764, "  Spare", 3),
+    enumField(1763, "  Additional layer 3 protocol info.", names::kAdditionalLayer3, 8),
+    unsignedField(1766, "  Spare", 3),
+    enumField(1765, "  Extension Bit", names::kBearerExtension, 1),
+    hexField(1723, " Raw Data", 0),
 
     // ==== Mobile identities, location and time (cap/mobile.cpp): fields in
     // ==== decoding order

@@ -1,0 +1,339 @@
+// Party numbers and ISUP / Q.931 parameters through the real entry points:
+// each case puts one element into an operation argument and checks the
+// texts from the element's tag on, the key entries the numbers mark and the
+// names the display pass shows.  The bytes are asymmetric so that a swapped
+// half-octet or bit field shows.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "engine/scratch.h"
+#include "support/harness.h"
+
+using camel::test::Bytes;
+using camel::test::decode;
+using camel::test::hexBytes;
+using camel::test::Span;
+using Texts = std::vector<std::string>;
+
+namespace {
+
+Bytes tlv(uint8_t tag, const Bytes &content) {
+    Bytes out{tag, uint8_t(content.size())};
+    out.insert(out.end(), content.begin(), content.end());
+    return out;
+}
+
+// A Begin holding one Invoke of operation `op` whose argument is a SEQUENCE
+// of the given elements (or the given argument itself when `sequence` is
+// false).
+Bytes invoke(uint8_t op, const std::string &elements, bool sequence = true) {
+    Bytes component = hexBytes("02 01 01 02 01");
+    component.push_back(op);
+    const Bytes arg = sequence ? tlv(0x30, hexBytes(elements)) : hexBytes(elements);
+    component.insert(component.end(), arg.begin(), arg.end());
+    Bytes content = hexBytes("48 01 01");
+    const Bytes portion = tlv(0x6C, tlv(0xA1, component));
+    content.insert(content.end(), portion.begin(), portion.end());
+    return tlv(0x62, content);
+}
+
+constexpr uint8_t kInitialDp = 0x00, kConnect = 0x14, kConnectToResource = 0x13,
+                  kEstablishTemporaryConnection = 0x11;
+
+// The texts from the first field with id `from` to the end.
+Texts textsFrom(const camel::test::Decoded &d, uint32_t from) {
+    const Texts all = d.texts();
+    for (size_t i = 0; i < d.fields.size(); ++i)
+        if (d.fields[i].id == from)
+            return Texts(all.begin() + long(i), all.end());
+    return {};
+}
+
+// The display text of the first field with id `id`.
+std::string shownOf(const camel::test::Decoded &d, uint32_t id) {
+    for (size_t i = 0; i < d.fields.size() && i < d.shown.size(); ++i)
+        if (d.fields[i].id == id)
+            return d.shown[i].text;
+    return "?";
+}
+
+struct Case {
+    const char *name;
+    uint8_t op;
+    std::string elements;
+    uint32_t tagId; // the element's tag field: texts are compared from it on
+    Texts texts;
+};
+
+void check(const Case &c, bool sequence = true) {
+    SCOPED_TRACE(c.name);
+    const auto d = decode(invoke(c.op, c.elements, sequence));
+    EXPECT_EQ(textsFrom(d, c.tagId), c.texts);
+    EXPECT_EQ(d.md.errorFlags, 0u);
+}
+
+// Address digits: low half-octet first, count from the length and the
+// odd/even indicator, filler after an odd count.
+TEST(PartyNumbers, CalledCallingAndChargeNumbers) {
+    const Case cases[] = {
+        {"called, odd: three digits and a filler", kInitialDp, "82 04 83 10 B1 5C", 1614,
+         {"Called Party Number Tag=82", "  LENGTH=4 octet(s)",
+          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd", "Spare=0",
+          "  Numbering Plan Indicator=ISDN/telephony", "Internal Network Num Ind=Routing to Innallowed",
+          "  Called Party Num=1bc", "Filler=5"}},
+        {"called, even: four digits", kInitialDp, "82 04 7F F5 B1 5C", 1614,
+         {"Called Party Number Tag=82", "  LENGTH=4 octet(s)", "  Nature Of Address Ind=Spare (127)",
+          "  Odd/even Indicator=Even", "Spare=5", "  Numbering Plan Indicator=Spare(7)",
+          "Internal Network Num Ind=Routing to Inn Notallowed", "  Called Party Num=1bc5"}},
+        {"called, odd, no digit octets", kInitialDp, "82 02 83 10", 1614,
+         {"Called Party Number Tag=82", "  LENGTH=2 octet(s)",
+          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd", "Spare=0",
+          "  Numbering Plan Indicator=ISDN/telephony", "Internal Network Num Ind=Routing to Innallowed"}},
+        {"called, one octet", kInitialDp, "82 01 83", 1614,
+         {"Called Party Number Tag=82", "  LENGTH=1 octet(s)",
+          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd"}},
+        {"IP routing address of Connect to Resource", kConnectToResource, "80 05 84 10 21 43 F5", 1532,
+         {"Resource Address(choice)=IP Routing Address Tag", "  LENGTH=5 octet(s)",
+          "  Nature Of Address Ind=International Number", "  Odd/even Indicator=Odd", "Spare=0",
+          "  Numbering Plan Indicator=ISDN/telephony", "Internal Network Num Ind=Routing to Innallowed",
+          "  Called Party Num=12345", "Filler=f"}},
+        {"calling", kInitialDp, "83 05 84 2B 21 43 F5", 1612,
+         {"Calling Party Number Tag=83", "  LENGTH=5 octet(s)", "  Nature Of Address Ind=International Number",
+          "  Odd/even Indicator=Odd", "  Screening Indicator=network provided",
+          "  Pres. Restric. Indicator=Address Not Available", "  Numbering Plan Ind=Spare (2)",
+          "  Ni Ind=Complete", "  Calling Party Num=12345", "Filler=f"}},
+        {"charge, even", kConnect, "93 04 01 D0 21 43", 1939,
+         {"Charge Number Tag=93", "  LENGTH=4 octet(s)", "  Nature Of Address Ind=Resv. For Subs. Number",
+          "  Odd/even Indicator=Even", "  Numbering Plan Indicator=Private Numbering Plan",
+          "  Address Signal=1234"}},
+        // No name for 127 in a charge number.
+        {"charge, odd", kConnect, "93 04 FF 50 21 C3", 1939,
+         {"Charge Number Tag=93", "  LENGTH=4 octet(s)", "  Nature Of Address Ind=", "  Odd/even Indicator=Odd",
+          "  Numbering Plan Indicator=Private Numbering Plan", "  Address Signal=123", "Filler=c"}},
+    };
+    for (const auto &c : cases)
+        check(c);
+}
+
+TEST(PartyNumbers, DigitSpansKeysAndDisplay) {
+    // Called party number 1bc + filler, then a charge number 1234.
+    const auto called = decode(invoke(kInitialDp, "82 04 83 10 B1 5C"));
+    const auto *digits = called.find(3589);
+    ASSERT_NE(digits, nullptr);
+    const uint32_t p = digits->spans[0].first;
+    EXPECT_EQ(digits->spans, (std::vector<Span>{{p, p + 3, 1}, {p + 4, p + 7, 0xB}, {p + 8, p + 11, 0xC}}));
+    EXPECT_EQ(digits->selector, 1u);
+    EXPECT_EQ(called.find(3590)->spans, (std::vector<Span>{{p + 12, p + 15, 5}}));
+    ASSERT_NE(called.key(10), nullptr);
+    EXPECT_EQ(called.key(10)->value, (Bytes{0x01, 0xBC}));
+    EXPECT_EQ(called.key(10)->bits, 12u);
+    EXPECT_EQ(called.key(12), nullptr);
+    EXPECT_EQ(shownOf(called, 1820), "Odd Number Of Address signals");
+    EXPECT_EQ(shownOf(called, 3589), "1bc");
+
+    const auto charge = decode(invoke(kConnect, "93 04 01 D0 21 43"));
+    ASSERT_NE(charge.key(12), nullptr);
+    EXPECT_EQ(charge.key(12)->value, (Bytes{0x12, 0x34}));
+    EXPECT_EQ(charge.key(10), nullptr);
+    EXPECT_EQ(shownOf(charge, 1943), "Even Num Of Addresssignals");
+    // The number layouts are restored after each number.
+    EXPECT_EQ(camel::g_scratch<camel::Pass::Decoded>.tagContext, 0u);
+    EXPECT_EQ(camel::g_scratch<camel::Pass::KeyField>.tagContext, 0u);
+
+    const auto calling = decode(invoke(kInitialDp, "83 05 84 2B 21 43 F5"));
+    ASSERT_NE(calling.key(15), nullptr);
+    EXPECT_EQ(calling.key(15)->value, (Bytes{0x01, 0x23, 0x45}));
+
+    // Shared display ids: every odd/even indicator under the first one,
+    // every filler under the called party's.
+    for (const auto &f : calling.fields)
+        if (f.label == "Odd/even Indicator" || f.label == "Filler") {
+            const size_t i = size_t(&f - calling.fields.data());
+            EXPECT_EQ(calling.shown[i].displayId, f.label == "Filler" ? 3590u : 1820u);
+        }
+    EXPECT_EQ(shownOf(decode(invoke(kInitialDp, "82 04 7F F5 B1 5C")), 1822), "Spare (7)");
+}
+
+// Generic address bodies: the generic-number layout for generic numbers,
+// the location-number layout for the location number; the redirection
+// numbers show every half-octet.
+TEST(PartyNumbers, GenericLocationAndRedirectionNumbers) {
+    const Case cases[] = {
+        {"location number", kInitialDp, "8A 04 03 7C 21 43", 1638,
+         {"Location Number Tag=8a", "  LENGTH=4 octet(s)", "  Nature Of Address Ind=National (significant) Num",
+          "  Odd/even Indicator=Even", "  Screening Indicator=Reserved", "  Numbering Plan Indicator=Spare (7)",
+          "Internal Network Num Ind=Routing to Inn Allowed", "  Pres. Restric. Indicator=Spare",
+          "  Address Signal In Generic=1234"}},
+        {"correlation id", kEstablishTemporaryConnection, "81 05 0B 03 7C 21 43", 1427,
+         {"Correlation Id Tag=81", "  LENGTH=5 octet(s)", "  Number Qualifier Indicator=Reserved",
+          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Even",
+          "  Screening Indicator=User Provided Not Verified", "  Numbering Plan Indicator=Spare (7)",
+          "  Ni Indicator=Complete", "  Pres. Restric. Indicator=Spare", "  Address Signal In Generic=1234"}},
+        {"generic numbers", kConnect, "AE 0C 04 05 01 03 10 21 43 04 03 0A 84 93", 2008,
+         {"Generic Numbers Tag=ae", "  LENGTH=12 octet(s)", "Generic Number Tag=4", "  LENGTH=5 octet(s)",
+          "  Number Qualifier Indicator=Additional Called Number",
+          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Even",
+          "  Screening Indicator=User Provided Not Verified", "  Numbering Plan Indicator=ISDN/telephony",
+          "  Ni Indicator=Complete", "  Pres. Restric. Indicator=Presentationallowed",
+          "  Address Signal In Generic=1234", "Generic Number Tag=4", "  LENGTH=3 octet(s)",
+          "  Number Qualifier Indicator=Called Freephone Num", "  Nature Of Address Ind=International Number",
+          "  Odd/even Indicator=Odd", "  Screening Indicator=Network Provided",
+          "  Numbering Plan Indicator=ISDN/telephony", "  Ni Indicator=Incomplete",
+          "  Pres. Restric. Indicator=Presentationallowed"}},
+        {"additional calling party number", kInitialDp, "99 05 06 04 1B 21 43", 1686,
+         {"Add. Calling Party No. Tag=99", "  LENGTH=5 octet(s)",
+          "  Number Qualifier Indicator=Addit Calling Party Num", "  Nature Of Address Ind=International Number",
+          "  Odd/even Indicator=Even", "  Screening Indicator=Network Provided",
+          "  Numbering Plan Indicator=ISDN/telephony", "  Ni Indicator=Complete",
+          "  Pres. Restric. Indicator=Address Not Available", "  Address Signal In Anon=1234"}},
+        {"original called party id", kInitialDp, "8C 04 83 5B 21 F3", 1640,
+         {"Original Called Party Id Tag=8c", "  LENGTH=4 octet(s)",
+          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd",
+          "  Numbering Plan Indicator=Res For Nationaluse(05)",
+          "  Pres. Restric. Indicator=Address Not Aavailable", "  Address Signal In Called=123f"}},
+        {"redirecting party id", kInitialDp, "9D 04 83 5B 21 F3", 1812,
+         {"Redirecting Party Id Tag=9d", "  LENGTH=4 octet(s)",
+          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd",
+          "  Numbering Plan Indicator=Private Numbering Plan", "  Pres. Restric. Indicator=Address Not Available",
+          "  Address Signal In Redir=123f"}},
+    };
+    for (const auto &c : cases)
+        check(c);
+
+    // Generic Address nature of address 127 is shown "Spare (127)".
+    const auto location = decode(invoke(kInitialDp, "8A 03 7F 7C 21"));
+    EXPECT_EQ(location.find(3557)->text, "  Nature Of Address Ind=Spare(127)");
+    EXPECT_EQ(shownOf(location, 3557), "Spare (127)");
+
+    // 16 digits at most: the rest of the element is left over.
+    const auto redirecting = decode(invoke(kInitialDp, "9D 0C 83 13 21 43 65 87 09 21 43 65 87 09"));
+    EXPECT_EQ(redirecting.find(1818)->text, "  Address Signal In Redir=1234567890123456");
+    EXPECT_EQ(redirecting.md.errorFlags, uint32_t(DPX_ERR_LEFTOVER));
+}
+
+TEST(PartyNumbers, IsupParameters) {
+    const Case cases[] = {
+        {"redirection information", kInitialDp, "9E 02 35 62", 1824,
+         {"Redirection Information Tag=9e", "  LENGTH=2 octet(s)",
+          "  Redirecting Indicator=Call Rerouted, Num Restrict", "  Original Redirection Reasons=Unconditional",
+          "  Redirection Counter=2", "  Redirecting Reason=Mobile Subscriber Not Reachable"}},
+        {"category", kInitialDp, "85 01 0A", 1632,
+         {"Calling Partys Category Tag=85", "  LENGTH=1 octet(s)",
+          "  Calling Partys Category=Ordinary Calling Subscriber"}},
+        // NA carrier id digits: low half of each octet first, one number.
+        {"carrier", kConnect, "8B 03 01 12 34", 1952,
+         {"Carrier Tag=8b", "  LENGTH=3 octet(s)",
+          "  Carrier Selection=Pre Subscribed And Not Input By Calling Party", "  NA Carrier Id=2143"}},
+        {"carrier, leading zero", kConnect, "8B 03 00 10 00", 1952,
+         {"Carrier Tag=8b", "  LENGTH=3 octet(s)", "  Carrier Selection=No Indication", "  NA Carrier Id=100"}},
+        {"alerting pattern", kConnect, "81 03 01 02 05", 1125,
+         {"Alerting Pattern Tag=81", "  LENGTH=3 octet(s)", "  Alerting Pattern(spare)=102",
+          "  Type Of Alerting=Alertingcategory 2"}},
+        {"alerting pattern, reserved", kConnect, "81 03 00 00 03", 1125,
+         {"Alerting Pattern Tag=81", "  LENGTH=3 octet(s)", "  Alerting Pattern(spare)=0",
+          "  Type Of Alerting=Reserved"}},
+        {"cause with diagnostics", kInitialDp, "91 04 E2 91 01 0A", 1474,
+         {"Cause Tag=91", "  LENGTH=4 octet(s)", "  Location=Public Network Serving The Llocal User",
+          "  Coding Standard=Standard Specific TO Identified Location", "  Cause Value=User Busy (17)",
+          "  Extension Indicator=No Extension", "  Diagnostics=10a"}},
+        {"release call cause", 0x16, "84 02 80 81", 1474,
+         {"Cause Tag=84", "  LENGTH=2 octet(s)", "  Location=User", "  Coding Standard=ITU-T standardized coding",
+          "  Cause Value=Unallocated (unassigned) Number (1)", "  Extension Indicator=No Extension"}},
+    };
+    for (const auto &c : cases)
+        check(c, c.op != 0x16);
+
+    const auto carrier = decode(invoke(kConnect, "8B 03 01 12 34"));
+    EXPECT_EQ(shownOf(carrier, 1955), "Pre Subs And Not Input");
+    const auto cause = decode(invoke(0x16, "84 02 85 81", false));
+    EXPECT_EQ(shownOf(cause, 1476), "Private Ntwk / Remote User");
+    EXPECT_EQ(shownOf(cause, 1480), "Unallocated Number (1)");
+    ASSERT_NE(cause.key(8), nullptr);
+    EXPECT_EQ(cause.key(8)->value, Bytes{0x01});
+}
+
+TEST(PartyNumbers, HighLayerCompatibility) {
+    const Case cases[] = {
+        {"ITU-T coding", kInitialDp, "97 02 91 E3", 1671,
+         {"High Layer Compatibility Tag=97", "  LENGTH=2 octet(s)", "  Coding Standard=CCITT Standard",
+          "  Interpretation=First High Layer Character", "  Presentation Method=High Layer Protocol Profile",
+          "  High Layer Charac Identification=Reserved For Audiovisual(63h)",
+          "  Extension Indicator=No Extension"}},
+        // Any other coding standard: the national part, then octet 4a.
+        {"national coding, octet 4a", kInitialDp, "97 03 B1 41 A1", 1671,
+         {"High Layer Compatibility Tag=97", "  LENGTH=3 octet(s)", "  Coding Standard=",
+          "  Interpretation=First High Layer Character", "  Presentation Method=High Layer Protocol Profile",
+          "  Etsi High Layer Char Identi=Eurofile Transfer", "  Extension Indicator=Extension",
+          "  Extended High Layer=Ini Cha 3.1khz Audio Or Speech"}},
+    };
+    for (const auto &c : cases)
+        check(c);
+    EXPECT_EQ(shownOf(decode(invoke(kInitialDp, "97 02 91 E3")), 1676), "High Layer Protocolprofile");
+}
+
+TEST(PartyNumbers, BearerCapability) {
+    const Texts speechHead = {"Bearer Capability Tag=bb", "  LENGTH=5 octet(s)", "Choice=Bearer Cap TAG",
+                              "  LENGTH=3 octet(s)"};
+    const auto with = [](Texts head, const Texts &tail) {
+        head.insert(head.end(), tail.begin(), tail.end());
+        return head;
+    };
+    const Case cases[] = {
+        {"speech", kInitialDp, "BB 05 80 03 80 90 A3", 1698,
+         with(speechHead,
+              {"  Information Transfer Capability=Speech", "  Coding Standard=CCITT Standardised Coding",
+               "  Extension Bit=No extension", "  Information Transfer Rate=64 Kbit/s",
+               "  Transfer Mode=Circuit Mode", "  Extension Bit=No extension", "  Extension Bit=No extension",
+               "  Layer Id=Layer 1", "  User information layer 1 protocol=Recommendation G.711 A-law"})},
+        // Octet 4.1 follows the multirate code only.
+        {"multirate", kInitialDp, "BB 05 80 03 88 98 86", 1698,
+         with(speechHead,
+              {"  Information Transfer Capability=Unrestricted Digital Information",
+               "  Coding Standard=CCITT Standardised Coding", "  Extension Bit=No extension",
+               "  Information Transfer Rate=Multirate(64 Kbit/s Base Rate)", "  Transfer Mode=Circuit Mode",
+               "  Extension Bit=No extension", "  Rate multiplier=6", "  Extension Bit=No extension"})},
+        {"invalid layer, raw data", kInitialDp, "BB 07 80 05 90 90 01 77 08", 1698,
+         {"Bearer Capability Tag=bb", "  LENGTH=7 octet(s)", "Choice=Bearer Cap TAG", "  LENGTH=5 octet(s)",
+          "  Information Transfer Capability=3.1 Khz Audio", "  Coding Standard=CCITT Standardised Coding",
+          "  Extension Bit=No extension", "  Information Transfer Rate=64 Kbit/s",
+          "  Transfer Mode=Circuit Mode", "  Extension Bit=No extension", "  Extension Bit=Extension",
+          "  Layer Id=Invalid", "  Invalid Data=1", " Raw Data=7708"}},
+    };
+    for (const auto &c : cases)
+        check(c);
+
+    // Layer 1 with V.110 octets 5a to 5d, layer 2, layer 3 with 7a and 7b.
+    const auto d = decode(invoke(kInitialDp, "BB 0D 80 0B 88 90 21 4F 3B 55 91 C2 6B 0C 8C"));
+    EXPECT_EQ(d.md.errorFlags, 0u);
+    const Texts texts = textsFrom(d, 1725);
+    EXPECT_EQ(texts.size(), 30u);
+    EXPECT_EQ(Texts(texts.begin() + 1, texts.begin() + 5),
+              (Texts{"  Extension Bit=Extension", "  Synchronous/Asynchronous=Asynchronous data",
+                     "  In-band negotiation=Not possible", "  User rate=56 kbit/s"}));
+    EXPECT_EQ(d.find(1734)->text, "  Intermediate rate=8 kbit/s");
+    EXPECT_EQ(d.find(1739)->text, "  Spare=1");
+    EXPECT_EQ(d.find(1750)->text, "  Parity information=Forced to 1");
+    EXPECT_EQ(d.find(1751)->text, "  Number of data bits excluding parity Bit=7 bits");
+    EXPECT_EQ(d.find(1752)->text, "  Number of stop bits=1.5 bits");
+    EXPECT_EQ(d.find(1755)->text, "  Modem type=Recommendation V.21");
+    EXPECT_EQ(d.find(1758)->text, "  User information layer 2 protocol=Recommendation Q.921/I.441");
+    EXPECT_EQ(d.find(1760)->text,
+              " User information layer 3 protocol=ISO/IEC TR 9577 (Protocol identification in the network layer)");
+    const auto *info = d.find(1763);
+    ASSERT_NE(info, nullptr);
+    EXPECT_EQ(info->text, "  Additional layer 3 protocol info.=Internet Protocol (RFC 791) (ISO/IEC TR 9577)");
+    const uint32_t p = info->spans[0].first;
+    EXPECT_EQ(info->spans, (std::vector<Span>{{p, p + 3, 0xC}, {p + 8, p + 11, 0xC}}));
+    EXPECT_EQ(texts.back(), "  Extension Bit=No extension");
+
+    EXPECT_EQ(shownOf(d, 1700), "Bearer Cap");
+    EXPECT_EQ(shownOf(d, 1705), "ITU-T standardized coding");
+    // A modem type in a code-point range.
+    const auto modem = decode(invoke(kInitialDp, "BB 09 80 07 88 90 21 4F 55 31 B3"));
+    EXPECT_EQ(modem.find(1755)->text, "  Modem type=User specified");
+    EXPECT_EQ(modem.find(1751)->text, "  Number of data bits excluding parity Bit=7 bits");
+}
+
+} // namespace
