@@ -13,6 +13,7 @@
 #include "fields/names_cap.h"
 #include "fields/names_results.h"
 #include "fields/names_party.h"
+#include "fields/names_mobile.h"
 #include "fields/names_tcap.h"
 
 namespace camel {
@@ -666,14 +667,194 @@ inline constexpr FieldDef kFields[] = {
     enumField(1765, "  Extension Bit", names::kBearerExtension, 1),
     hexField(1723, " Raw Data", 0),
 
-    // ==== Mobile identities, location and time (cap/mobile.cpp): fields in
+    // ==== Mobile identities, location and time (cap/mobile.cpp, location.cpp): fields in
     // ==== decoding order
+    // CUG Index
+    argLength(1192),
+    unsignedField(1193, "CUG Index", 0).indented(),
+    // IMSI
+    argLength(2020),
+    digitsField(2025, "IMSI Digits").indented().key(17, KeyForm::Variable),
+    hexField(2026, "filler", 4),
+    digitsField(2029, "IMSI Digits").indented().key(17, KeyForm::Variable),
+    // Subscriber State: its four alternatives
+    tagField(2116, "Assumed Idle").indented(),
+    argLength(2117),
+    tagField(2118, "Camel Busy").indented(),
+    argLength(2119),
+    tagField(2120, "Net Det Not Reachable").indented(),
+    argLength(2121),
+    enumField(2122, "Not Reachable Reason", names::mobile::kNotReachableReason).indented(),
+    tagField(2123, "Not Provided From VLR").indented(),
+    argLength(2124),
+    // Location Information
+    argLength(2032),
+    tagField(2044, "Age Of Location Information").indented(),
+    argLength(2045),
+    unsignedField(2046, "Age Of Location Information", 0).indented(),
+    tagField(2047, "Geographical Information Tag"),
+    argLength(2048),
+    enumField(2049, "Type Of Shape", names::mobile::kTypeOfShape, 4)
+        .display(names::mobile::kTypeOfShapeShown)
+        .indented(),
+    hexField(2050, "Latitude", 24).indented(),
+    hexField(2051, "Degrees Of Longitude", 24),
+    unsignedField(2052, "Uncertainty Code", 7),
+    tagField(2059, "VLR Number"),
+    argLength(2060),
+    // ISDN address body (VLR number, ISDN Address String)
+    enumField(2054, "Numbering Plan Ind", names::mobile::kAddressNumberingPlan, 4).indented(),
+    enumField(2055, "Nature Of Address", names::mobile::kAddressNature, 3).indented(),
+    enumField(2056, "Extension Indicator", names::mobile::kAddressExtension, 1).indented(),
+    digitsField(2058, "ISDN Address Digits").indented(),
+    // Location number
+    tagField(2061, "Location Number").indented(),
+    argLength(2062),
+    enumField(2063, "Odd/even Indicator", names::mobile::kOddEven, 1)
+        .display(names::mobile::kOddEvenShown)
+        .indented(),
+    enumField(2064, "Nature Of Address Indicator", names::mobile::kLocationNature, 7).indented(),
+    enumField(2065, "Internal Network Number Ind", names::mobile::kInternalNetworkNumber, 1)
+        .display(names::mobile::kInternalNetworkNumberShown)
+        .indented(),
+    enumField(2066, "Numbering Plan Indicator", names::mobile::kLocationNumberingPlan, 3)
+        .indented(),
+    enumField(2067, "Presentation Indicator", names::mobile::kPresentation, 2).indented(),
+    enumField(2068, "Screening Indicator", names::mobile::kScreening, 2).indented(),
+    digitsField(2069, "Address Signals").indented(),
+    // Cell Id Or Sai Or LAI; the MCC-MNC-LAC block lists its three-digit
+    // MNC before the two-digit one, so that "MNC" is shown under 2083
+    tagField(2070, "Cell Id Or Sai Or LAI Tag"),
+    argLength(2071),
+    tagField(2077, "CellGlobalIdOrServiceAreaIdFixedLength Tag"),
+    argLength(2078),
+    digitsField(2079, "  MCC"),
+    hexField(2080, "NAS Filler Don't Show", 4),
+    digitsField(2083, "MNC").indented().spanSelector(2),
+    hexField(2085, "  Filler", 4),
+    digitsField(2086, "MNC").indented(),
+    unsignedField(2087, "Location Area Code", 16).indented(),
+    hexField(2088, "Cell Identity", 16).indented(),
+    tagField(2074, "laiFixedLength Tag"),
+    argLength(2075),
+    // Extension Container
+    tagField(2090, "Extension Container Tag"),
+    argLength(2091),
+    tagField(2094, "Private Extension List").indented(),
+    argLength(2095),
+    tagField(2097, "Private Extension").indented(),
+    argLength(2098),
+    tagField(2100, "Ext Id Tag"),
+    argLength(2101),
+    digitsField(2102, "Extension Id").indented(),
+    digitsField(2099, "Ext Type").indented(),
+    tagField(2103, "PCS-Extensions").indented(),
+    argLength(2104),
+    // Selected LSA id, MSC number, geodetic information, current location
+    tagField(2215, "Selected LSA-id").indented(),
+    argLength(2216),
+    hexField(2217, "Selected LSA-Id Value", 24).indented(),
+    tagField(2153, "SMS MSC Number Tag"),
+    argLength(2160),
+    tagField(2107, "Geodetic Information").indented(),
+    argLength(2108),
+    digitsField(2109, "Geodetic Information").indented(),
+    tagField(2105, "Current Location Retrieved").indented(),
+    argLength(2106, "LENGTH(null)"),
+    // Called Party BCD Number
+    argLength(2138),
+    enumField(2139, "Number Plan Identification", names::mobile::kBcdNumberingPlan, 4)
+        .otherwise("Reserved")
+        .indented(),
+    enumField(2140, "Type Of Number", names::mobile::kBcdTypeOfNumber, 3).indented(),
+    digitsField(2141, "Number Digits").indented(),
+    // Time and Timezone
+    argLength(2232),
+    hexField(2233, "Year", 16).indented(),
+    hexField(2234, "Month").indented(),
+    hexField(2235, "Day").indented(),
+    hexField(2236, "Hour").indented(),
+    hexField(2237, "Minute").indented(),
+    hexField(2238, "Second").indented(),
+    enumField(2239, "Time Zone Algebraic Sign", names::mobile::kTimeZoneSign, 1).indented(),
+    unsignedField(2240, "Time Zone ", 7).indented(),
+    // Initial DP Arg Extension
+    tagField(2149, "GSMC Address Tag"),
+    tagField(4216, "MS_Classmark2 Tag").indented(),
+    argLength(4217),
+    digitsField(4218, "MS_Classmark2 Info").indented(),
+    tagField(4219, "IMEI Tag").indented(),
+    argLength(4220),
+    digitsField(4221, "IMEI Info").indented(),
     tagField(4190, "SupportedCamelPhases Tag").indented(),
     argLength(4191),
     digitsField(4192, "SupportedCamelPhases Info").indented(),
     tagField(4193, "OfferedCamel4Functionalities Tag").indented(),
     argLength(4194),
     digitsField(4195, "OfferedCamel4Functionalities Info").indented(),
+    tagField(4222, "Ext_BasicServiceCode Tag").indented(),
+    argLength(4223),
+    digitsField(4224, "Ext_BasicServiceCode Info").indented(),
+    tagField(4229, "HighLayerCompatibility Tag").indented(),
+    argLength(4230),
+    digitsField(4231, "HighLayerCompatibility Info").indented(),
+    tagField(4226, "LowLayerCompatibility Tag").indented(),
+    argLength(4227),
+    digitsField(4228, "LowLayerCompatibility Info").indented(),
+    // Play Announcement and Prompt And Collect User Info: the flags and the
+    // requestAnnouncementStartedNotification
+    tagField(1833, "Disconnect From IP Forbidden Tag"),
+    argLength(1834),
+    names::mobile::boolean(1835, "Disconnect Forbidden Value"),
+    tagField(1837, "Request Announce Complete Tag"),
+    argLength(1838),
+    names::mobile::boolean(1839, "Request Announce Value"),
+    tagField(4328, "requestAnnouncementStartedNotification Tag", 16).indented(),
+    argLength(4236),
+    names::mobile::boolean(4237, "Boolean Value"),
+    // Collect Info
+    tagField(1841, "Collect Info Tag"),
+    argLength(1842),
+    enumField(1843, "Choice", names::mobile::kCollectInfoChoice).indented(),
+    argLength(1848),
+    tagField(1861, "Minimum Number Of Digits Tag").indented(),
+    argLength(1862),
+    unsignedField(1863, "Number Of Digits").indented(),
+    tagField(1864, "Maximum Number Of Digits Tag"),
+    argLength(1865),
+    unsignedField(1866, "Number Of Digits").indented(),
+    tagField(1867, "End Of Reply Digit Tag"),
+    argLength(1868),
+    hexField(1869, "End Of Reply Digit Value", 0).indented(),
+    tagField(1870, "Cancel Digit Tag"),
+    argLength(1871),
+    hexField(1872, "Cancel Digit Value", 0).indented(),
+    tagField(1873, "Start Digit Tag"),
+    argLength(1874),
+    hexField(1875, "Start Digit Value", 0).indented(),
+    tagField(1876, "First Digit Time Out Tag"),
+    argLength(1877),
+    unsignedField(1878, "First Digit Time Out Value").indented(),
+    tagField(1879, "Inter Digit Time Out Tag"),
+    argLength(1880),
+    unsignedField(1881, "Inter Digit Time Out Value").indented(),
+    tagField(1882, "Error Treatment Tag"),
+    argLength(1883),
+    enumField(1884, "Error Treatment Value", names::mobile::kErrorTreatment).indented(),
+    tagField(1885, "Interruptable Ann Ind Tag").indented(),
+    argLength(1886),
+    names::mobile::boolean(1887, "Interruptable Ann Ind Value"),
+    tagField(1889, "Voice Information Tag").indented(),
+    argLength(1890),
+    names::mobile::boolean(1891, "Voice Information Value"),
+    tagField(1893, "Voice Back Tag").indented(),
+    argLength(1894),
+    names::mobile::boolean(1895, "Voice Back Value"),
+    // Reset Timer
+    argLength(2305),
+    enumField(2306, "Timer Id Value", names::mobile::kTimerId).indented(),
+    argLength(1375),
+    unsignedField(1376, "Timer Value Info(second)", 0).indented(),
 
     // Return Result (Last), Return Error, Reject
     tagField(3669, "Return Result (Last)").key(27, KeyForm::Octet),

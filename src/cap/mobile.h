@@ -1,0 +1,66 @@
+// Pieces of the mobile types that other CAMEL areas reuse: fixed-size value
+// fields, the MCC-MNC-LAC block and the Extension Container.
+#pragma once
+
+#include <cstdint>
+
+#include "engine/members.h"
+
+namespace camel {
+
+// A unit that starts at its own length field is the element body of a row
+// without identifier: decodeMember opens the body's window from the length
+// at the cursor, shows the length field and decodes the row's value.
+consteval Member body(const char *name, uint32_t lengthId, Value value) {
+    return alt(0, name, lengthId, value);
+}
+template <Pass P>
+inline int elementBody(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Member &body) {
+    return decodeMember<P>(st, ctx, rq, body, 0);
+}
+
+// Fixed-size values: when the window holds fewer bits than the field, the
+// field is absent and the rest of the element is skipped.
+template <Pass P>
+inline int fixedOctets(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+                       uint32_t octets) {
+    if (ctx->present != 0 && !room(st, 8 * octets))
+        ctx->present = 0;
+    return octetsField<P>(st, ctx, rq, f, octets);
+}
+template <Pass P>
+inline int fixedBcd(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+                    uint32_t digits) {
+    if (ctx->present != 0 && !room(st, 4 * digits))
+        ctx->present = 0;
+    return bcdDigitsField<P>(st, ctx, rq, f, digits);
+}
+
+// The field ids of one MCC-MNC-LAC block: the location area identity of a
+// cell or location area here, the routing area identity of GPRS.
+struct MccMncFields {
+    FieldIndex mcc;           // three digits, low half of octet 1 first
+    FieldIndex fillerTest;    // bits 8-5 of octet 2, shown but not consumed
+    FieldIndex filler;        // the same half-octet when it is 0xF
+    FieldIndex twoDigitMnc;   // octet 3, bits 8-5 first
+    FieldIndex threeDigitMnc; // octet 3 bits 8-5, bits 4-1, then the filler-test half-octet
+    FieldIndex areaCode;      // octets 4-5
+};
+
+// MCC, filler test, filler and MNC or three-digit MNC, location area code.
+template <Pass P>
+int mccMncBlock(DecodeState *st, ElementContext *ctx, Request<P> *rq, const MccMncFields &f);
+
+// Extension Container, from its length field on.
+template <Pass P>
+int decodeExtensionContainer(DecodeState *st, ElementContext *ctx, Request<P> *rq);
+
+// A unit made of one body row: `unit` starts at its length field.
+#define CAMEL_BODY_UNIT(unit, bodyRow)                                                        \
+    template <Pass P>                                                                       \
+    int unit(DecodeState *st, ElementContext *ctx, Request<P> *rq) {                        \
+        return elementBody<P>(st, ctx, rq, bodyRow);                                        \
+    }                                                                                       \
+    CAMEL_INSTANTIATE_UNIT(unit, DecodeState *, ElementContext *)
+
+} // namespace camel
