@@ -4,6 +4,8 @@
 // rows call are in the other files of this folder.
 #include "cap/arguments.h"
 
+#include "cap/charging.h"
+#include "cap/rows.h"
 #include "cap/units.h"
 
 namespace camel {
@@ -12,15 +14,6 @@ namespace {
 
 // ---- Rows shared by several arguments ------------------------------------------
 
-// Extensions under the identifier each argument gives them.
-consteval Member extensions(uint32_t tag) {
-    return el(tag, "Extensions", 1481, 0, CAMEL_UNIT(decodeExtensions));
-}
-consteval Member callSegmentId(uint32_t tag, uint32_t tagId = 4178) {
-    return el(tag, "Call Segment ID", tagId, 0, CAMEL_UNIT(decodeCallSegmentId));
-}
-consteval Member legId(uint32_t tag) { return el(tag, "Leg Id", 1541, 0, CAMEL_UNIT(decodeLegId)); }
-consteval Member cause(uint32_t tag) { return el(tag, "Cause", 1474, 0, CAMEL_UNIT(decodeCause)); }
 consteval Member alertingPattern() {
     return el(0x81, "Alerting Pattern", 1125, 0, CAMEL_UNIT(decodeAlertingPattern));
 }
@@ -64,12 +57,6 @@ consteval Member redirectionInformation() {
 consteval Member originalCalledPartyId(uint32_t tag) {
     return el(tag, "Original Called Party Id", 1640, 0, CAMEL_UNIT(decodeOriginalCalledPartyId));
 }
-consteval Member receivingSideId(uint32_t tag) {
-    return el(tag, "Receiving Side ID", 1545, 0, CAMEL_UNIT(decodeReceivingSideId));
-}
-consteval Member sendingSideId(uint32_t tag) {
-    return el(tag, "Sending Side Id", 1549, 0, CAMEL_UNIT(decodeSendingSideId));
-}
 consteval Member eventTypeBcsm(uint32_t tag) {
     return el(tag, "Event Type BCSM", 1555, 0, CAMEL_UNIT(decodeEventTypeBcsm));
 }
@@ -89,12 +76,6 @@ consteval Member destinationRoutingAddress() {
     return el(0xA0, "Destination Routing Address", 1830, 1831, table(kCalledPartyNumbers));
 }
 
-// The outer SEQUENCE of an argument, a mandatory element walked as an
-// element loop.
-consteval Member sequence(const char *name, uint32_t tagId, uint32_t lengthId,
-                          const MemberTable &loop) {
-    return el(0x30, name, tagId, lengthId, table(loop));
-}
 
 // ---- Assist Request Instructions (16) -----------------------------------------------
 
@@ -346,11 +327,6 @@ constexpr Member kEntityReleased[] = {
 
 // ---- The argument tables ----------------------------------------------------------------------
 
-// An argument with an outer element: that element is mandatory.
-template <size_t N>
-consteval MemberTable argument(const Member (&outer)[N]) {
-    return members(Walk::Mandatory, outer);
-}
 
 constexpr MemberTable kAssistRequestInstructionsTable = argument(kAssistRequestInstructionsArg);
 constexpr MemberTable kCallInformationReportTable = argument(kCallInformationReportArg);
@@ -378,7 +354,10 @@ constexpr MemberTable kEntityReleasedTable = members(Walk::Choice, kEntityReleas
 
 const Argument kArguments[] = {
     {55, nullptr}, // Activity Test
+    {35, &kApplyChargingTable},
+    {36, &kApplyChargingReportTable},
     {16, &kAssistRequestInstructionsTable},
+    {41, &kCallGapTable},
     {44, &kCallInformationReportTable},
     {45, &kCallInformationRequestTable},
     {53, &kCancelTable},
@@ -389,10 +368,15 @@ const Argument kArguments[] = {
     {18, nullptr}, // Disconnect Forward Connection
     {17, &kEstablishTemporaryConnectionTable},
     {24, &kEventReportBcsmTable},
+    {34, &kFurnishChargingInformationTable},
     {0, &kInitialDpTable},
+    {47, &kPlayAnnouncementTable},
+    {48, &kPromptAndCollectUserInformationTable},
     {22, &kReleaseCallTable},
     {23, &kRequestReportBcsmEventTable},
     {33, &kResetTimerTable},
+    {46, &kSendChargingInformationTable},
+    {49, &kSpecializedResourceReportTable},
     {65, nullptr}, // SMS Continue
     {70, nullptr}, // GPRS Activity Test
     {86, &kDisconnectForwardConnectionWithArgumentTable},
@@ -402,6 +386,7 @@ const Argument kArguments[] = {
     {93, &kMoveLegTable},
     {95, &kSplitLegTable},
     {96, &kEntityReleasedTable},
+    {97, &kPlayToneTable},
 };
 const uint32_t kArgumentCount = sizeof(kArguments) / sizeof(kArguments[0]);
 

@@ -81,7 +81,14 @@ CAMEL_DECLARE_UNIT(decodeRequestAnnounceComplete);
 CAMEL_DECLARE_UNIT(decodeRequestAnnouncementStartedNotification);
 CAMEL_DECLARE_UNIT(decodeCollectInfo);
 
-// ---- Charging, call gap and information to send
-CAMEL_DECLARE_UNIT(decodeGenericDigits);            // after "Type Of Digits": scheme and digits
+// ---- Charging, call gap and information to send (charging.cpp,
+// ---- information_to_send.cpp)
+CAMEL_DECLARE_UNIT(decodeAChChargingAddress);       // after its length
+CAMEL_DECLARE_UNIT(decodeAppendFreeFormatData);     // after its length
+// Generic Digits from the octet that starts with the type of digits, right
+// after the "Type Of Digits" field (which consumes nothing): the encoding
+// scheme, then the digits it names.  Bit 23 of `tagContext` selects the
+// first of the two field-id sets.
+CAMEL_DECLARE_UNIT(decodeGenericDigits);
 
 } // namespace camel

@@ -1,0 +1,43 @@
+// Rows and table shapes that several argument files share: the elements
+// that many arguments carry under identifiers of their own, and the outer
+// element of an argument.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "cap/units.h"
+#include "engine/members.h"
+
+namespace camel {
+
+// Extensions under the identifier each argument gives them.
+consteval Member extensions(uint32_t tag) {
+    return el(tag, "Extensions", 1481, 0, CAMEL_UNIT(decodeExtensions));
+}
+consteval Member callSegmentId(uint32_t tag, uint32_t tagId = 4178) {
+    return el(tag, "Call Segment ID", tagId, 0, CAMEL_UNIT(decodeCallSegmentId));
+}
+consteval Member legId(uint32_t tag) { return el(tag, "Leg Id", 1541, 0, CAMEL_UNIT(decodeLegId)); }
+consteval Member cause(uint32_t tag) { return el(tag, "Cause", 1474, 0, CAMEL_UNIT(decodeCause)); }
+consteval Member receivingSideId(uint32_t tag) {
+    return el(tag, "Receiving Side ID", 1545, 0, CAMEL_UNIT(decodeReceivingSideId));
+}
+consteval Member sendingSideId(uint32_t tag) {
+    return el(tag, "Sending Side Id", 1549, 0, CAMEL_UNIT(decodeSendingSideId));
+}
+
+// The outer SEQUENCE of an argument, a mandatory element walked as an
+// element loop.
+consteval Member sequence(const char *name, uint32_t tagId, uint32_t lengthId,
+                          const MemberTable &loop) {
+    return el(0x30, name, tagId, lengthId, table(loop));
+}
+
+// An argument with an outer element: that element is mandatory.
+template <size_t N>
+consteval MemberTable argument(const Member (&outer)[N]) {
+    return members(Walk::Mandatory, outer);
+}
+
+} // namespace camel

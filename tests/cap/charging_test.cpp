@@ -1,0 +1,255 @@
+// Charging, call gap and announcement arguments through the real entry
+// points: the time duration charging and its audible indicator, the
+// charging report, Furnish and Send Charging Information, gap indicators
+// and treatment, Information To Send with its message ids and variable
+// parts, bursts and the Specialized Resource Report; then the bit layouts
+// (charging address, append indicator, generic digits), the display names
+// of the choices, and what a cap or an unknown alternative leaves over.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "support/harness.h"
+
+using camel::test::Bytes;
+using camel::test::decode;
+using camel::test::hexBytes;
+using camel::test::Span;
+using Texts = std::vector<std::string>;
+
+namespace {
+
+// An End (destination id 0A 0B 0C 0D) carrying Invoke 1 of `opcode` with
+// the argument octets; every length here is below 128.
+Bytes endWithInvoke(uint8_t opcode, const std::string &argument) {
+    const Bytes arg = hexBytes(argument);
+    Bytes invoke = hexBytes("02 01 01 02 01");
+    invoke.push_back(opcode);
+    invoke.insert(invoke.end(), arg.begin(), arg.end());
+    Bytes out = hexBytes("64 00 49 04 0A 0B 0C 0D 6C 00 A1");
+    out.push_back(static_cast<uint8_t>(invoke.size()));
+    out.insert(out.end(), invoke.begin(), invoke.end());
+    out[9] = static_cast<uint8_t>(invoke.size() + 2);
+    out[1] = static_cast<uint8_t>(out.size() - 2);
+    return out;
+}
+
+// The decoded-field texts after the operation code.
+Texts argumentTexts(const camel::test::Decoded &d) {
+    const Texts all = d.texts();
+    for (size_t i = 0; i < d.fields.size(); ++i)
+        if (d.fields[i].id == 1066)
+            return Texts(all.begin() + long(i) + 1, all.end());
+    return {};
+}
+
+// Arguments whose every element is decoded by the units of this area.
+TEST(Charging, ArgumentsFieldByField) {
+    const struct {
+        const char *name;
+        uint8_t opcode;
+        std::string argument;
+        Texts texts;
+        uint32_t flags;
+    } cases[] = {
+        {"Apply Charging: time duration charging with a tone", 35,
+         "30 14 80 12 A0 10 80 02 04 B0 81 01 00 82 02 0E 10 A3 03 01 01 FF",
+         {"Sequence Tag=30", "  LENGTH=20 octet(s)", "Ach Bill Charging Chars Tag=80", "  LENGTH=18 octet(s)",
+          "Time Duration Charging Tag=a0", "  LENGTH=16 octet(s)", "Max Call Period Duration Tag=80",
+          "  LENGTH=2 octet(s)", "  Max Call Period Duration(100 milliseconds)=1200",
+          "Release IF Duration Exceeded Tag=81", "  LENGTH=1 octet(s)", "  Release If Duration Exceeded Value=False",
+          "Tariff Switch Interval Tag=82", "  LENGTH=2 octet(s)", "  Tariff Switch Interval(second)=3600",
+          "AudibleIndicator Tag=a3", "  LENGTH=3 octet(s)", "AudibleIndicator Type=tone", "  LENGTH=1 octet(s)",
+          "  Boolean Value=True"},
+         0},
+        {"Apply Charging: burst list", 35, "30 16 80 14 A0 12 82 01 3C A3 0D A1 0B 80 01 2D A1 06 80 01 03 83 01 05",
+         {"Sequence Tag=30", "  LENGTH=22 octet(s)", "Ach Bill Charging Chars Tag=80", "  LENGTH=20 octet(s)",
+          "Time Duration Charging Tag=a0", "  LENGTH=18 octet(s)", "Tariff Switch Interval Tag=82",
+          "  LENGTH=1 octet(s)", "  Tariff Switch Interval(second)=60", "AudibleIndicator Tag=a3", "  LENGTH=13 octet(s)",
+          "AudibleIndicator Type=burstList", "  LENGTH=11 octet(s)", "WarningPeriod Tag=80", "  LENGTH=1 octet(s)",
+          "  Warning Period (in seconds)=45", "Burst Tag=a1", "  LENGTH=6 octet(s)", "numberOfBursts Tag=80",
+          "  LENGTH=1 octet(s)", "  Number Of Bursts=3", "toneDuration Tag=83", "  LENGTH=1 octet(s)",
+          "  Tone Duration (in 100 msec units)=5"},
+         0},
+        {"Call Gap: indicators shown in hexadecimal, tone treatment", 41,
+         "30 1C A1 08 80 02 01 2C 81 02 03 E8 82 01 01 A3 0D A0 0B A1 09 80 02 1A 2B 81 03 01 00 00",
+         {"Sequence Tag=30", "  LENGTH=28 octet(s)", "Gap Indicator Tag=a1", "  LENGTH=8 octet(s)", "Duration Tag=80",
+          "  LENGTH=2 octet(s)", "  Duration Value=12c", "Gap Interval Tag=81", "  LENGTH=2 octet(s)",
+          "  Gap Interval Data=3e8", "Control Type Tag=82", "  LENGTH=1 octet(s)", "  Control Type=Manually Initiated",
+          "Gap Treatment Tag=a3", "  LENGTH=13 octet(s)", "Choice=Information To Send Tag", "  LENGTH=11 octet(s)",
+          "Choice=Tone Tag", "  LENGTH=9 octet(s)", "Tone Id Tag=80", "  LENGTH=2 octet(s)", "  Tone Id Info=1a2b",
+          "Duration Tag=81", "  LENGTH=3 octet(s)", "  Duration Info=65536"},
+         0},
+        {"Furnish Charging Information: free format data, append", 34, "04 0A A0 08 80 03 0A 1B 2C 82 01 05",
+         {"Furnish Charging Information Tag=4", "  LENGTH=10 octet(s)", "Camel Fci Bill Cha Char Tag=a0",
+          "  LENGTH=8 octet(s)", "Free Format Data Tag=80", "  LENGTH=3 octet(s)", "  Free Format Data=0a1b2c",
+          "  Append Free FORMAT Data=82", "  LENGTH=1 octet(s)", "  Append Free Format Data=Append"},
+         0},
+        {"Send Charging Information: advice of charge before answer", 46,
+         "30 13 80 11 A0 0F A0 06 80 01 01 86 01 07 A1 05 A0 00 81 01 3C",
+         {"Sequence Tag=30", "  LENGTH=19 octet(s)", "SCI Bill & Charg Char Tag=80", "  LENGTH=17 octet(s)",
+          "Choice=AOC Before Answer Tag", "  LENGTH=15 octet(s)", "  CAI GSM0224 Tag=a0", "  LENGTH=6 octet(s)",
+          "  E1 Tag=80", "  LENGTH=1 octet(s)", "  E1=1", "E7 Tag=86", "  LENGTH=1 octet(s)", "  E7=7",
+          "AOC Subsequent Tag=a1", "  LENGTH=5 octet(s)", "  CAI GSM0224 Tag=a0", "  LENGTH=0 octet(s)",
+          "Tariff Switch Interval Tag=81", "  LENGTH=1 octet(s)", "  Tariff Switch Interval(second)=60"},
+         0},
+        {"Play Announcement: variable message with every variable part", 47,
+         "30 27 A0 25 A0 23 A0 21 BE 1F 80 01 4D A1 1A 80 03 01 E2 40 81 03 21 21 43 82 02 13 45 83 04 20 24 05 17 "
+         "84 04 00 00 12 50",
+         {"Sequence Tag=30", "  LENGTH=39 octet(s)", "Information To Send Tag=a0", "  LENGTH=37 octet(s)",
+          "Choice=Inband Info Tag", "  LENGTH=35 octet(s)", "Message Id Tag=a0", "  LENGTH=33 octet(s)",
+          "Choice=Variable Message Tag", "  LENGTH=31 octet(s)", "Elementary Message Tag=80", "  LENGTH=1 octet(s)",
+          "  Elementary ID Value=77", "Variable Parts Tag=a1", "  LENGTH=26 octet(s)", "  Integer Tag=80",
+          "  LENGTH=3 octet(s)", "  Integer Value=123456", "  Number Tag=81", "  LENGTH=3 octet(s)",
+          "  Type Of Digits=Res Authorisation Code", "  Encoding Scheme=Bcd Odd", "  Bcd Digits=1234", "Time Tag=82",
+          "  LENGTH=2 octet(s)", "  Hour=13", "  Minute=45", "Date Tag=83", "  LENGTH=4 octet(s)", "  Year=2024",
+          "  Month=5", "  Day=17", "Price Tag=84", "  LENGTH=4 octet(s)", "  Price Value=1250"},
+         0},
+        {"Play Announcement: text, then message ids repeated", 47,
+         "30 1A A0 18 A0 16 A0 0A A1 08 80 02 48 69 81 02 0A B0 A0 08 BD 06 02 01 05 02 01 06",
+         {"Sequence Tag=30", "  LENGTH=26 octet(s)", "Information To Send Tag=a0", "  LENGTH=24 octet(s)",
+          "Choice=Inband Info Tag", "  LENGTH=22 octet(s)", "Message Id Tag=a0", "  LENGTH=10 octet(s)",
+          "Choice=Text Tag", "  LENGTH=8 octet(s)", "Message Content Tag=80", "  LENGTH=2 octet(s)",
+          "  Message Content Info=4869", "Attributes Tag=81", "  LENGTH=2 octet(s)", "  Attributes Info=0ab0",
+          "Message Id Tag=a0", "  LENGTH=8 octet(s)", "Choice=Elementary Messageids Tag", "  LENGTH=6 octet(s)",
+          "Elementary Id Tag=2", "  LENGTH=1 octet(s)", "  Elementary Id Value=5", "Elementary Id Tag=2",
+          "  LENGTH=1 octet(s)", "  Elementary Id Value=6"},
+         0},
+        {"Specialized Resource Report: first announcement started", 49, "9F 33 00",
+         {"SpecializedResourceReportArg Choice=firstAnnouncementStarted", "  LENGTH=0 octet(s)"}, 0},
+        {"Play Tone: a burst", 97, "30 05 A1 03 84 01 0A",
+         {"PlayToneArg Tag=30", "  LENGTH=5 octet(s)", "Burst Tag=a1", "  LENGTH=3 octet(s)", "toneInterval Tag=84",
+          "  LENGTH=1 octet(s)", "  Tone Interval (in 100 msec units)=10"},
+         0},
+        // Faults: a value longer than its cap keeps its first octets and
+        // leaves the rest over; an alternative no choice names is shown
+        // with no name and its octets are left over.
+        {"Gap interval beyond its two octets", 41, "30 07 A1 05 81 03 00 88 E0",
+         {"Sequence Tag=30", "  LENGTH=7 octet(s)", "Gap Indicator Tag=a1", "  LENGTH=5 octet(s)",
+          "Gap Interval Tag=81", "  LENGTH=3 octet(s)", "  Gap Interval Data=88"},
+         DPX_ERR_LEFTOVER},
+        {"Information To Send, unknown alternative", 47, "30 06 A0 04 A2 02 80 00",
+         {"Sequence Tag=30", "  LENGTH=6 octet(s)", "Information To Send Tag=a0", "  LENGTH=4 octet(s)", "Choice="},
+         DPX_ERR_LEFTOVER},
+        {"Specialized Resource Report, unknown identifier", 49, "9F 34 00", {}, DPX_ERR_LEFTOVER},
+        {"Apply Charging Report without its wrapper", 36, "30 02 A0 00", {}, DPX_ERR_MANDATORY_MISSING | DPX_ERR_LEFTOVER},
+    };
+    for (const auto &c : cases) {
+        SCOPED_TRACE(c.name);
+        const auto r = decode(endWithInvoke(c.opcode, c.argument));
+        EXPECT_EQ(argumentTexts(r), c.texts);
+        EXPECT_EQ(r.md.errorFlags, c.flags);
+        EXPECT_EQ(r.md.remainingBits, 0u);
+    }
+}
+
+// The charging report's own fields around the party to charge (decoded by
+// the side-id unit); the charging address's alternative chosen by the tag
+// number of its identifier, which is shown without being consumed.
+TEST(Charging, ReportAndChargingAddress) {
+    const auto r = decode(endWithInvoke(
+        36, "04 1D A0 1B A0 00 A1 0A A1 08 80 02 01 2C 81 02 0E 10 82 01 FF 83 00 84 00 A5 04 9F 32 01 05"));
+    const struct {
+        uint32_t id;
+        const char *text;
+    } shown[] = {
+        {1412, "Choice=Time If Tariff Switch"},
+        {1420, "  Time Since Tariff Switch Value(100 millisecond)=300"},
+        {1396, "  Tariff Switch Interval(second)=3600"},
+        {1423, "  Call Active=True"},
+        {1426, "  LENGTH(null)=0 octet(s)"},
+        {1481, "Extensions Tag=84"},
+        {4196, "AChChargingAddress Tag=a5"},
+        {4200, "AChChargingAddress Type=1f"},
+        {4205, "AChChargingAddress Tag (srfConnection)=329f"},
+    };
+    for (const auto &s : shown) {
+        const auto *f = r.find(s.id);
+        ASSERT_NE(f, nullptr) << s.id;
+        EXPECT_EQ(f->text, s.text);
+    }
+    // Type: bits 1-5 of the identifier octet, nothing consumed; the tag
+    // that follows starts on the same octet.
+    const auto *type = r.find(4200);
+    const auto *tag = r.find(4205);
+    ASSERT_EQ(type->spans.size(), 1u);
+    EXPECT_EQ(type->spans[0].last - type->spans[0].first, 4u);
+    EXPECT_EQ(type->spans[0].first, tag->spans[0].first);
+    EXPECT_EQ(tag->spans[0].last - tag->spans[0].first, 15u);
+
+    // Tag number 2 selects the leg alternative, whatever the class bits.
+    for (const char *leg : {"A2", "82"}) {
+        SCOPED_TRACE(leg);
+        const auto a = decode(endWithInvoke(35, std::string("30 04 BF 32 01 ") + leg));
+        ASSERT_NE(a.find(4203), nullptr);
+        EXPECT_EQ(a.find(4200)->text, "AChChargingAddress Type=2");
+        EXPECT_EQ(a.find(4205), nullptr);
+    }
+}
+
+// Fields narrower than an octet and digits: their spans, and the display
+// pass's names and ids.
+TEST(Charging, BitLayoutsAndDisplay) {
+    // Append Free Format Data: bits 1-2 of an octet whose other bits are set.
+    const auto fci = decode(endWithInvoke(34, "04 05 A0 03 82 01 FD"));
+    const auto *append = fci.find(2191);
+    ASSERT_NE(append, nullptr);
+    EXPECT_EQ(append->text, "  Append Free Format Data=Append");
+    ASSERT_EQ(append->spans.size(), 1u);
+    EXPECT_EQ(append->spans[0].last - append->spans[0].first, 1u);
+    EXPECT_EQ(fci.md.errorFlags, 0u);
+
+    // Generic digits outside the generic-number context: the second id set.
+    // Type of digits (bits 1-5) and scheme (bits 6-8) share the first octet;
+    // BCD digits come low half first, one span each.
+    const auto pa = decode(endWithInvoke(47, "30 0F A0 0D A0 0B A0 09 BE 07 A1 05 81 03 03 21 F3"));
+    const auto *type = pa.find(1649);
+    const auto *scheme = pa.find(3533);
+    const auto *digits = pa.find(3539);
+    ASSERT_TRUE(type && scheme && digits);
+    EXPECT_EQ(pa.find(3530), nullptr);
+    EXPECT_EQ(type->text, "  Type Of Digits=Res Business ");
+    EXPECT_EQ(scheme->text, "  Encoding Scheme=Bcd Even");
+    EXPECT_EQ(scheme->spans[0].first, type->spans[0].first + 5);
+    EXPECT_EQ(scheme->spans[0].last, type->spans[0].first + 7);
+    EXPECT_EQ(digits->text, "  Bcd Digits=123f");
+    ASSERT_EQ(digits->spans.size(), 4u);
+    EXPECT_EQ(digits->spans[0], (Span{scheme->spans[0].last + 1, scheme->spans[0].last + 4, 1}));
+    EXPECT_EQ(digits->selector, 1u);
+    // Binary-coded digits: every octet high half first.
+    const auto bin = decode(endWithInvoke(47, "30 0E A0 0C A0 0A A0 08 BE 06 A1 04 81 02 7F A5"));
+    ASSERT_NE(bin.find(3551), nullptr);
+    EXPECT_EQ(bin.find(3551)->text, "  Binary Digits=a5");
+    EXPECT_EQ(bin.find(1649)->text, "  Type Of Digits=Res For Extension");
+
+    // Choice names differ in the display pass; every "Choice" shares one
+    // display id.
+    const auto cg = decode(endWithInvoke(41, "30 10 A0 02 A2 00 A3 0A A0 08 A0 06 A0 04 80 02 00 07"));
+    const struct {
+        uint32_t id;
+        const char *md;
+        const char *shown;
+    } names[] = {
+        {1442, "Choice=Gap On Service Tag", "Gap Onservice"},
+        {1472, "Choice=Information To Send Tag", "InformationTO Send"},
+        {1304, "Choice=Inband Info Tag", "Inband Info"},
+        {1331, "Choice=Elementary Message Id Tag", "Elementary Message Id"},
+    };
+    uint32_t choiceDisplayId = 0;
+    for (const auto &n : names) {
+        SCOPED_TRACE(n.id);
+        size_t i = 0;
+        while (i < cg.fields.size() && cg.fields[i].id != n.id)
+            ++i;
+        ASSERT_LT(i, cg.fields.size());
+        EXPECT_EQ(cg.fields[i].text, n.md);
+        EXPECT_EQ(cg.shown[i].text, n.shown);
+        if (choiceDisplayId == 0)
+            choiceDisplayId = cg.shown[i].displayId;
+        EXPECT_EQ(cg.shown[i].displayId, choiceDisplayId);
+    }
+    EXPECT_EQ(cg.md.errorFlags, 0u);
+}
+
+} // namespace
