@@ -601,9 +601,6 @@ inline constexpr FieldDef kFields[] = {
     argLength(4185),
     tagField(4211, "suppressOutgoingCallBarring Tag"),
     argLength(4212),
-    tagField(4186, "LegOrCallSegment Tag"),
-    argLength(4187),
-    enumField(4188, "LegOrCallSegment Type", names::kLegOrCallSegment),
     argLength(1542),
     enumField(1543, "Choice", names::kLegIdChoice).display(names::kLegIdChoiceShown).indented(),
     // SCF Id
@@ -875,7 +872,7 @@ inline constexpr FieldDef kFields[] = {
     enumField(1738, "  Flow control on reception (Rx)", names::kAccepted, 1),
     unsignedField(1739, "  Spare", 1),
     enumField(1742, "  Rate adaption header", names::kRateAdaptionHeader, 1),
-    enumField(1743, "  Multiple frame establishment support in data link", names::kSupported, 1),
+    enumField(1743, "  Multiple frame establishment support in data link", names::kFrameSupport, 1),
     enumField(1744, "  Mode of operation", names::kModeOfOperation, 1),
     enumField(1745, "  Logical link identifier negotiation", names::kLliNegotiation, 1),
     enumField(1746, "  Assignor/assignee", names::kAssignor, 1),
@@ -1032,17 +1029,11 @@ inline constexpr FieldDef kFields[] = {
     digitsField(4228, "LowLayerCompatibility Info").indented(),
     // Play Announcement and Prompt And Collect User Info: the flags and the
     // requestAnnouncementStartedNotification
-    tagField(1833, "Disconnect From IP Forbidden Tag"),
     argLength(1834),
     names::mobile::boolean(1835, "Disconnect Forbidden Value"),
-    tagField(1837, "Request Announce Complete Tag"),
     argLength(1838),
     names::mobile::boolean(1839, "Request Announce Value"),
-    tagField(4328, "requestAnnouncementStartedNotification Tag", 16).indented(),
-    argLength(4236),
-    names::mobile::boolean(4237, "Boolean Value"),
     // Collect Info
-    tagField(1841, "Collect Info Tag"),
     argLength(1842),
     enumField(1843, "Choice", names::mobile::kCollectInfoChoice).indented(),
     argLength(1848),

@@ -89,7 +89,6 @@ inline constexpr ValueName kSpecializedResourceReport[] = {
     {0x339F, "firstAnnouncementStarted"},
 };
 
-inline constexpr ValueName kLegOrCallSegment[] = {{0x80, "callSegmentID"}, {0xA1, "legID"}};
 
 // A choice field that names only the first `n` values of its table (and of
 // its display table).

@@ -520,7 +520,7 @@ inline constexpr ValueName kRequired[] = {{0, "Not required"}, {1, "Required"}};
 inline constexpr ValueName kAccepted[] = {{0, "Cannot accept"}, {1, "Can accept"}};
 // Octet 5b for V.120 rate adaption.
 inline constexpr ValueName kRateAdaptionHeader[] = {{0, "Not included"}, {1, "Included"}};
-inline constexpr ValueName kSupported[] = {{0, "Not supported"}, {1, "Supported"}};
+inline constexpr ValueName kFrameSupport[] = {{0, "Not supported"}, {1, "Supported"}};
 inline constexpr ValueName kModeOfOperation[] = {
     {0, "Bit transparent mode of operation"},
     {1, "Protocol sensitive mode of operation"},

@@ -17,12 +17,6 @@ inline constexpr ValueName kResultOperation[] = {
 
 inline constexpr ValueName kReceivedInformation[] = {{0x80, "Digits Response Tag"}};
 
-inline constexpr ValueName kTypeOfDigits[] = {{0, "Res Account Code"},
-                                              {1, "Res Authorisation Code"},
-                                              {2, "Res Private Networking"},
-                                              {3, "Res Business "},
-                                              {31, "Res For Extension"}};
-
 inline constexpr ValueName kErrorCodeTag[] = {{0x02, "Local Error Code"},
                                               {0x06, "Global Error Code"}};
 
