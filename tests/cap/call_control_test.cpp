@@ -151,7 +151,7 @@ TEST(CallControl, DisplayNames) {
     EXPECT_EQ(shown(report, 1547), "Receiving Side ID");
     for (size_t i = 0; i < report.fields.size(); ++i) {
         if (report.fields[i].label == "Choice") {
-            EXPECT_EQ(report.shown[i].displayId, 1103u) << report.fields[i].id;
+            EXPECT_EQ(report.shown[i].displayId, 1551u) << report.fields[i].id;
         }
     }
 

@@ -146,12 +146,13 @@ TEST(PartyNumbers, DigitSpansKeysAndDisplay) {
     ASSERT_NE(calling.key(15), nullptr);
     EXPECT_EQ(calling.key(15)->value, (Bytes{0x01, 0x23, 0x45}));
 
-    // Shared display ids: every odd/even indicator under the first one,
+    // Shared display ids: every odd/even indicator under the first one (the
+    // generic number of Assist Request Instructions comes first),
     // every filler under the called party's.
     for (const auto &f : calling.fields)
         if (f.label == "Odd/even Indicator" || f.label == "Filler") {
             const size_t i = size_t(&f - calling.fields.data());
-            EXPECT_EQ(calling.shown[i].displayId, f.label == "Filler" ? 3590u : 1820u);
+            EXPECT_EQ(calling.shown[i].displayId, f.label == "Filler" ? 3590u : 1661u);
         }
     EXPECT_EQ(shownOf(decode(invoke(kInitialDp, "82 04 7F F5 B1 5C")), 1822), "Spare (7)");
 }
