@@ -264,7 +264,8 @@ constexpr BitField kBearerOctet4[] = {{fx(1707), 0, 5}, {fx(1708), 0, 2}, {fx(17
 constexpr BitField kBearerOctet41[] = {{fx(1712), 0, 7}, {fx(1706), 0, 1}};
 
 // The information transfer rate after which octet 4.1 (rate multiplier)
-// follows: multirate.
+// follows: multirate only.  After 64 kbit/s, the common rate, the next
+// octet is the layer 1 octet.
 constexpr uint32_t kMultirate = 24;
 
 // A layer octet opens with its extension bit and layer identification.
