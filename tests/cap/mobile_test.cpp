@@ -42,6 +42,23 @@ Texts from(const Decoded &d, uint32_t id) {
     return {};
 }
 
+// Decodes an Initial DP holding `element`; checks the texts from field `id`
+// on and the error flags.
+Decoded expectTexts(const std::string &element, uint32_t id, const Texts &texts, uint32_t flags) {
+    SCOPED_TRACE(element);
+    const Decoded d = decode(initialDp(element));
+    EXPECT_EQ(from(d, id), texts);
+    EXPECT_EQ(d.md.errorFlags, flags);
+    return d;
+}
+
+// An element's contents, the texts expected from one field on, the flags.
+struct TextCase {
+    std::string content;
+    Texts texts;
+    uint32_t flags;
+};
+
 // The display id each field with `id` was shown under.
 std::vector<uint32_t> displayIds(const Decoded &d, uint32_t id) {
     std::vector<uint32_t> out;
@@ -96,11 +113,7 @@ TEST(MobileImsi, DigitCountFollowsTheLengthAndFillsKeyEntry17) {
 // The location area identity of a cell or location area: MCC, filler test,
 // then the two-digit MNC (after a filler) or the three-digit MNC.
 TEST(MobileLocationArea, MncFormsAndShortWindows) {
-    const struct {
-        std::string cell;
-        Texts texts; // from the MCC on
-        uint32_t flags;
-    } cases[] = {
+    const TextCase cases[] = { // texts from the MCC on
         {"81 05 32 F4 51 12 34",
          {"  MCC=234", "NAS Filler Don't Show=f", "  Filler=f", "  MNC=51", "  Location Area Code=4660"},
          0},
@@ -118,13 +131,8 @@ TEST(MobileLocationArea, MncFormsAndShortWindows) {
         // An alternative that is neither a cell nor a location area.
         {"82 01 32", {}, DPX_ERR_LEFTOVER},
     };
-    for (const auto &c : cases) {
-        SCOPED_TRACE(c.cell);
-        const Decoded d = decode(initialDp(tlv("BF 34", tlv("A3", c.cell))));
-        EXPECT_EQ(from(d, 2079), c.texts);
-        EXPECT_EQ(d.md.errorFlags, c.flags);
-        EXPECT_EQ(d.md.remainingBits, 0u);
-    }
+    for (const auto &c : cases)
+        EXPECT_EQ(expectTexts(tlv("BF 34", tlv("A3", c.content)), 2079, c.texts, c.flags).md.remainingBits, 0u);
     // Three-digit MNC: bits 8-5 and 4-1 of octet 3, then bits 8-5 of octet 2.
     const Decoded d = decode(initialDp(tlv("BF 34", tlv("A3", "81 05 32 14 51 12 34"))));
     const uint32_t p = d.find(2079)->spans[0].first;
@@ -142,11 +150,7 @@ TEST(MobileLocationArea, MncFormsAndShortWindows) {
 }
 
 TEST(MobileTime, SwappedHalfOctetsAndTimeZone) {
-    const struct {
-        std::string content;
-        Texts texts; // from the year on
-        uint32_t flags;
-    } cases[] = {
+    const TextCase cases[] = { // texts from the year on
         {"02 50 30 21 90 45 00 88",
          {"  Year=2005", "  Month=3", "  Day=12", "  Hour=9", "  Minute=54", "  Second=0",
           "  Time Zone Algebraic Sign= - ", "  Time Zone =8"},
@@ -159,12 +163,8 @@ TEST(MobileTime, SwappedHalfOctetsAndTimeZone) {
         {"02", {}, DPX_ERR_LEFTOVER},
         {"02 50 30", {"  Year=2005", "  Month=3"}, 0},
     };
-    for (const auto &c : cases) {
-        SCOPED_TRACE(c.content);
-        const Decoded d = decode(initialDp(tlv("9F 39", c.content)));
-        EXPECT_EQ(from(d, 2233), c.texts);
-        EXPECT_EQ(d.md.errorFlags, c.flags);
-    }
+    for (const auto &c : cases)
+        expectTexts(tlv("9F 39", c.content), 2233, c.texts, c.flags);
     const Decoded d = decode(initialDp(tlv("9F 39", "02 50 30 21 90 45 00 88")));
     EXPECT_EQ(d.find(2240)->label, "Time Zone ");
     const uint32_t p = d.find(2233)->spans[0].first;
@@ -241,11 +241,7 @@ TEST(MobileLocationInformation, EveryMemberInItsOrder) {
 }
 
 TEST(MobileSubscriberState, AlternativeChosenByItsIdentifier) {
-    const struct {
-        std::string alternative;
-        Texts texts; // after the subscriber state's length
-        uint32_t flags;
-    } cases[] = {
+    const TextCase cases[] = { // texts after the subscriber state's length
         {"80 00", {"  Assumed Idle=80", "  LENGTH=0 octet(s)"}, 0},
         {"81 00", {"  Camel Busy=81", "  LENGTH=0 octet(s)"}, 0},
         {"0A 01 01", {"  Net Det Not Reachable=a", "  LENGTH=1 octet(s)", "  Not Reachable Reason=IMSI Detached"}, 0},
@@ -254,12 +250,10 @@ TEST(MobileSubscriberState, AlternativeChosenByItsIdentifier) {
         {"83 00", {}, DPX_ERR_LEFTOVER},
     };
     for (const auto &c : cases) {
-        SCOPED_TRACE(c.alternative);
-        const Decoded d = decode(initialDp(tlv("BF 33", c.alternative)));
-        Texts texts = from(d, 2110);
-        ASSERT_GE(texts.size(), 2u);
-        EXPECT_EQ(Texts(texts.begin() + 2, texts.end()), c.texts);
-        EXPECT_EQ(d.md.errorFlags, c.flags);
+        Texts texts{"Subscriber State Tag=33bf",
+                    "  LENGTH=" + std::to_string(hexBytes(c.content).size()) + " octet(s)"};
+        texts.insert(texts.end(), c.texts.begin(), c.texts.end());
+        expectTexts(tlv("BF 33", c.content), 2110, texts, c.flags);
     }
 }
 
