@@ -14,12 +14,9 @@ namespace {
 // where the cursor stands (the filler test did not consume them).
 template <Pass P>
 int threeDigitMnc(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
+    needBits(st, ctx, 12);
     if (ctx->present == 0)
         return 1;
-    if (!room(st, 12)) {
-        ctx->present = 0;
-        return 1;
-    }
     beginField(st, f);
     if (!ensureSpans(st, 2))
         return 0;

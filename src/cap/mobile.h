@@ -21,18 +21,20 @@ inline int elementBody(DecodeState *st, ElementContext *ctx, Request<P> *rq, con
 
 // Fixed-size values: when the window holds fewer bits than the field, the
 // field is absent and the rest of the element is skipped.
+inline void needBits(DecodeState *st, ElementContext *ctx, uint32_t bits) {
+    if (ctx->present != 0 && !room(st, bits))
+        ctx->present = 0;
+}
 template <Pass P>
 inline int fixedOctets(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
                        uint32_t octets) {
-    if (ctx->present != 0 && !room(st, 8 * octets))
-        ctx->present = 0;
+    needBits(st, ctx, 8 * octets);
     return octetsField<P>(st, ctx, rq, f, octets);
 }
 template <Pass P>
 inline int fixedBcd(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
                     uint32_t digits) {
-    if (ctx->present != 0 && !room(st, 4 * digits))
-        ctx->present = 0;
+    needBits(st, ctx, 4 * digits);
     return bcdDigitsField<P>(st, ctx, rq, f, digits);
 }
 
