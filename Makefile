@@ -12,7 +12,8 @@ SHELL := /bin/bash
 
 PRESETS := native asan m32
 DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
-                libbenchmark-dev nlohmann-json3-dev libcli11-dev tshark python3
+                libbenchmark-dev nlohmann-json3-dev libcli11-dev libpcap-dev tshark \
+                python3
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 
 SAMPLES := $(sort $(wildcard samples/*.txt))

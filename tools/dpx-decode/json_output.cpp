@@ -61,8 +61,18 @@ Json keysJson(const KeysOut &k) {
 
 } // namespace
 
-void writeJson(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r) {
+void writeJson(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r,
+               const CaptureOrigin *origin) {
     Json j{{"index", index}, {"hex", hex}};
+    if (origin != nullptr) {
+        const capture::TcapMessage &c = origin->carrier;
+        j["frame"] = origin->frame;
+        j["time"] = formatTime(origin->seconds, origin->nanoseconds);
+        j["opc"] = c.hasPointCodes ? Json(c.opc) : Json(nullptr);
+        j["dpc"] = c.hasPointCodes ? Json(c.dpc) : Json(nullptr);
+        j["calledSsn"] = c.hasCalledSsn ? Json(c.calledSsn) : Json(nullptr);
+        j["callingSsn"] = c.hasCallingSsn ? Json(c.callingSsn) : Json(nullptr);
+    }
     if (r.md)
         j["md"] = mdJson(*r.md);
     if (r.display)

@@ -1,3 +1,4 @@
+#include <cstdio>
 #include <ostream>
 
 #include "output.h"
@@ -87,8 +88,33 @@ std::string describeErrorFlags(uint32_t flags) {
     return s;
 }
 
+std::string formatTime(int64_t seconds, uint32_t nanoseconds) {
+    char buf[48];
+    std::snprintf(buf, sizeof buf, "%lld.%09u", static_cast<long long>(seconds), nanoseconds);
+    return buf;
+}
+
 void writeText(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r,
-               const TextOptions &options) {
+               const TextOptions &options, const CaptureOrigin *origin) {
+    if (origin != nullptr) {
+        const capture::TcapMessage &c = origin->carrier;
+        os << "frame " << origin->frame << " at " << formatTime(origin->seconds, origin->nanoseconds);
+        if (c.hasPointCodes)
+            os << ": opc " << c.opc << ", dpc " << c.dpc;
+        else
+            os << ": no point codes";
+        os << ", called SSN ";
+        if (c.hasCalledSsn)
+            os << unsigned(c.calledSsn);
+        else
+            os << '-';
+        os << ", calling SSN ";
+        if (c.hasCallingSsn)
+            os << unsigned(c.callingSsn);
+        else
+            os << '-';
+        os << '\n';
+    }
     os << "message " << index << ": " << hex << '\n';
     if (r.md) {
         for (const DecodedOut &f : r.md->fields) {
