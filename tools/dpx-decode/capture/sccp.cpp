@@ -43,9 +43,10 @@ bool parseAddress(Bytes a, bool ansi, SccpAddress &out) {
     return true;
 }
 
-// A mandatory variable part: the pointer at `at` (one octet, or two for
-// LUDT and LUDTS) counts from its own first octet to a length octet (two
-// for long data) and the value.
+// A mandatory variable part: the pointer at `at` counts from itself to a
+// length octet (two for long data) and the value.  The two-octet pointers
+// of LUDT and LUDTS (least significant octet first) count from their second
+// octet, as tshark reads them.
 bool variablePart(Bytes m, size_t at, bool widePointer, bool wideLength, Bytes &value) {
     const size_t pointerSize = widePointer ? 2 : 1;
     if (!m.has(at, pointerSize))
@@ -53,7 +54,7 @@ bool variablePart(Bytes m, size_t at, bool widePointer, bool wideLength, Bytes &
     const size_t pointer = widePointer ? m.le16(at) : m.u8(at);
     if (pointer == 0)
         return false;
-    const size_t start = at + pointer;
+    const size_t start = at + pointerSize - 1 + pointer;
     const size_t lengthSize = wideLength ? 2 : 1;
     if (!m.has(start, lengthSize))
         return false;
@@ -72,7 +73,7 @@ bool optionalPart(Bytes m, size_t at, bool widePointer, SccpSegmentation &seg) {
     const size_t pointer = widePointer ? m.le16(at) : m.u8(at);
     if (pointer == 0)
         return true; // no optional part
-    size_t pos = at + pointer;
+    size_t pos = at + pointerSize - 1 + pointer;
     for (;;) {
         if (!m.has(pos, 1))
             return false;
