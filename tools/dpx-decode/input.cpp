@@ -196,6 +196,7 @@ private:
         message_.source = name;
         message_.line = 0;
         message_.capture = &origin_;
+        walker_.newCapture();
         Sink sink;
         sink.reader = this;
         const auto start = std::chrono::steady_clock::now();

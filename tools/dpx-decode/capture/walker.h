@@ -51,6 +51,13 @@ public:
     // of messages found.
     size_t walk(uint32_t linkType, Bytes frame, MessageSink &sink);
 
+    // Forgets reassembly state and TSNs: the next frame starts a capture
+    // of its own.  The skip counts go on.
+    void newCapture() {
+        sctp_ = SctpReassembler(options_.sctp);
+        sccp_ = SccpReassembler(options_.sccp);
+    }
+
     // Skips by reason since construction.
     const std::array<uint64_t, kSkipCount> &skips() const { return skips_; }
 
