@@ -79,8 +79,19 @@ FUZZ_PACKAGES := clang libclang-rt-14-dev
 FUZZ_TIME ?= 300
 FUZZ_ARGS ?= -max_len=512 -dict=fuzz/camel.dict
 
-.PHONY: fuzz
-fuzz: deps
+.PHONY: fuzz fuzz-capture fuzz-tools
+fuzz: fuzz-tools
+	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
+	    $(FUZZ_ARGS) build/fuzz/corpus build/fuzz/seeds fuzz/corpus
+
+# make fuzz-capture: capture_fuzz, dpx-decode's frame walker (link layer to
+# TCAP message), over build/fuzz/capture-corpus and seeds from samples/*.pcap.
+fuzz-capture: fuzz-tools
+	mkdir -p build/fuzz/capture-corpus
+	build/fuzz/capture_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
+	    -max_len=4096 build/fuzz/capture-corpus build/fuzz/capture-seeds
+
+fuzz-tools: deps
 	@missing=""; \
 	for pkg in $(FUZZ_PACKAGES); do \
 	    dpkg -s "$$pkg" 2>/dev/null | grep -q '^Status: install ok installed' \
@@ -93,7 +104,5 @@ fuzz: deps
 	        apt-get install -y -qq --no-install-recommends $$missing; \
 	fi
 	cmake --preset fuzz
-	cmake --build --preset fuzz
+	cmake --build --preset fuzz -j2
 	mkdir -p build/fuzz/corpus
-	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
-	    $(FUZZ_ARGS) build/fuzz/corpus build/fuzz/seeds fuzz/corpus

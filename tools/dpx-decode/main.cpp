@@ -11,6 +11,7 @@
 #include <unistd.h>
 
 #include <iostream>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -151,20 +152,20 @@ int main(int argc, char **argv) {
     const bool json = format == "json";
     const dpxdecode::TextOptions textOptions{spans};
     uint64_t index = 0;
-    bool failed = false;
+    dpxdecode::Session session(module);
+    if (!session.ok()) {
+        std::cerr << "dpx-decode: out of memory preparing the decoding state\n";
+        return kExitBadInput;
+    }
     dpxdecode::MessageResult result;
+    std::optional<dpxdecode::MdOut> hiddenMd;
     dpxdecode::MessageSummary messageSummary;
     dpxdecode::Statistics statistics;
 
     const dpxdecode::InputReport report = dpxdecode::readMessages(
         hexArgs, files, inputOptions,
         [&](const dpxdecode::InputMessage &msg) {
-            if (!dpxdecode::runPasses(module, msg.bytes, run, result)) {
-                std::cerr << "dpx-decode: " << msg.source << ':' << msg.line
-                          << ": out of memory preparing the decoding state\n";
-                failed = true;
-                return;
-            }
+            session.run(msg.bytes.data(), msg.bytes.size(), run, result);
             if (summary || stats) {
                 dpxdecode::summarize(*result.md, messageSummary);
                 if (stats)
@@ -172,14 +173,18 @@ int main(int argc, char **argv) {
                 if (summary)
                     dpxdecode::writeSummary(std::cout, index, msg.capture, messageSummary);
             }
-            if (!showMd)
-                result.md.reset();
             if (passOutput) {
+                // The decoded fields made only for the summary or the
+                // statistics are set aside while the message is written.
+                if (!showMd)
+                    hiddenMd.swap(result.md);
                 const std::string hex = dpxdecode::toHex(msg.bytes);
                 if (json)
                     dpxdecode::writeJson(std::cout, index, hex, result, msg.capture);
                 else
                     dpxdecode::writeText(std::cout, index, hex, result, textOptions, msg.capture);
+                if (!showMd)
+                    hiddenMd.swap(result.md);
             }
             ++index;
         },
@@ -190,5 +195,5 @@ int main(int argc, char **argv) {
     std::cout.flush();
     if (report.damagedCapture)
         return kExitDamagedCapture;
-    return !report.badInput && !failed && std::cout.good() ? 0 : kExitBadInput;
+    return !report.badInput && std::cout.good() ? 0 : kExitBadInput;
 }
