@@ -2,7 +2,8 @@
 #
 #   make deps    install the Debian packages the build needs (root or sudo)
 #   make build   configure and build the native preset (build/native)
-#   make demo    deps + build, then decode the bundled sample messages
+#   make demo    deps + build, then decode the bundled sample messages and a
+#                sample capture
 #   make test    deps, then build and test the native, asan and m32 presets
 #   make bench   build, then run the benchmarks
 #   make clean   remove build/
@@ -17,7 +18,9 @@ DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 
 SAMPLES := $(sort $(wildcard samples/*.txt))
-DEMO_ARGS ?= $(SAMPLES)
+# A call flow over Ethernet/IPv4/SCTP/M3UA/SCCP (samples/callflow.hex).
+DEMO_CAPTURES := samples/callflow-m3ua.pcap
+DEMO_ARGS ?= $(SAMPLES) $(DEMO_CAPTURES)
 
 .PHONY: deps build demo test bench clean $(addprefix test-,$(PRESETS))
 
