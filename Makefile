@@ -6,6 +6,7 @@
 #                sample capture
 #   make test    deps, then build and test the native, asan and m32 presets
 #   make bench   build, then run the benchmarks
+#   make bench-capture   build, then dpx-decode against tshark on a capture
 #   make clean   remove build/
 
 SHELL := /bin/bash
@@ -69,6 +70,13 @@ bench: build
 	@test -x build/native/camel_bench \
 	    || { echo "make bench: camel_bench not built (bench/ or Google Benchmark missing)" >&2; exit 1; }
 	build/native/camel_bench
+
+# dpx-decode against tshark on one capture of BENCH_MESSAGES CAMEL messages
+# (bench/capture_bench.py; needs tshark and ../shared/tools).
+BENCH_MESSAGES ?= 100000
+.PHONY: bench-capture
+bench-capture: build
+	python3 bench/capture_bench.py --messages $(BENCH_MESSAGES)
 
 clean:
 	rm -rf build
