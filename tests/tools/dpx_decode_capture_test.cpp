@@ -6,7 +6,6 @@
 
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
-#include <sys/wait.h>
 
 #include <cstdio>
 #include <fstream>
@@ -15,6 +14,7 @@
 #include <vector>
 
 #include "capture_writer.h"
+#include "support/dpx_decode_run.h"
 
 namespace {
 
@@ -27,50 +27,15 @@ const Bytes kBegin{0x62, 0x06, 0x48, 0x04, 0x01, 0x02, 0x03, 0x04};
 const Bytes kEnd{0x64, 0x06, 0x49, 0x04, 0x01, 0x02, 0x03, 0x04};
 constexpr uint64_t kStart = 1767225600ull * 1000000000ull; // 2026-01-01
 
-struct Outcome {
-    int status = -1;
-    std::string out, err;
-    Lines lines() const {
-        Lines l;
-        std::istringstream in(out);
-        for (std::string s; std::getline(in, s);)
-            l.push_back(s);
-        return l;
-    }
-};
-
-std::string quote(const std::string &s) {
-    std::string q = "'";
-    for (char c : s)
-        q += c == '\'' ? std::string("'\\''") : std::string(1, c);
-    return q + "'";
-}
+using dpxtest::Outcome;
+using dpxtest::quote;
 
 std::string tempFile(const std::string &name, const Bytes &content) {
-    const std::string path = ::testing::TempDir() + "dpx_capture_" +
-                             ::testing::UnitTest::GetInstance()->current_test_info()->name() + "_" + name;
-    std::ofstream(path, std::ios::binary).write(reinterpret_cast<const char *>(content.data()),
-                                                std::streamsize(content.size()));
-    return path;
+    return dpxtest::tempFile(name, std::string(content.begin(), content.end()));
 }
 
 Outcome run(const std::string &args, const Bytes &input = {}) {
-    const std::string errPath = tempFile("stderr", {});
-    const std::string command = quote(DPX_BUILD_DIR "/dpx-decode") + " " + args + " <" +
-                                quote(tempFile("stdin", input)) + " 2>" + quote(errPath);
-    Outcome r;
-    FILE *p = popen(command.c_str(), "r");
-    if (p == nullptr)
-        return r;
-    char buf[4096];
-    for (size_t n; (n = fread(buf, 1, sizeof buf, p)) > 0;)
-        r.out.append(buf, n);
-    const int st = pclose(p);
-    r.status = WIFEXITED(st) ? WEXITSTATUS(st) : -1;
-    std::ostringstream err;
-    err << std::ifstream(errPath).rdbuf();
-    r.err = err.str();
-    return r;
+    return dpxtest::run(args, std::string(input.begin(), input.end()));
 }
 
 // Frame i carries `messages[i]` (empty: an ARP frame) over

@@ -49,22 +49,13 @@ IpOut parseIpv6(Bytes p) {
         switch (next) {
         case 0:  // hop-by-hop options
         case 43: // routing
-        case 60: // destination options
-        {
-            if (!rest.has(0, 2))
-                return skipped(Skip::Ipv6Truncated);
-            const size_t length = (size_t(rest.u8(1)) + 1) * 8;
-            if (!rest.has(0, length))
-                return skipped(Skip::Ipv6Truncated);
-            next = rest.u8(0);
-            rest = rest.from(length);
-            continue;
-        }
+        case 60: // destination options: length in 8-octet units, minus 1
         case 51: // authentication header: length in 4-octet units, minus 2
         {
             if (!rest.has(0, 2))
                 return skipped(Skip::Ipv6Truncated);
-            const size_t length = (size_t(rest.u8(1)) + 2) * 4;
+            const size_t units = rest.u8(1);
+            const size_t length = next == 51 ? (units + 2) * 4 : (units + 1) * 8;
             if (!rest.has(0, length))
                 return skipped(Skip::Ipv6Truncated);
             next = rest.u8(0);

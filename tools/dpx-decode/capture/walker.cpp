@@ -122,7 +122,8 @@ void FrameWalker::sctp(const IpOut &ip, MessageSink &sink) {
 
 void FrameWalker::userMessage(uint32_t protocolId, uint16_t sport, uint16_t dport, Bytes message,
                               MessageSink &sink) {
-    switch (adaptationFor(protocolId, sport, dport)) {
+    const Adaptation adaptation = adaptationFor(protocolId, sport, dport);
+    switch (adaptation) {
     case Adaptation::M3ua: {
         const M3uaOut m = parseM3ua(message);
         if (m.skip != Skip::None) {
@@ -136,16 +137,9 @@ void FrameWalker::userMessage(uint32_t protocolId, uint16_t sport, uint16_t dpor
         sccp(m.userData, Origin{true, m.routing.opc, m.routing.dpc}, sink);
         return;
     }
-    case Adaptation::M2ua: {
-        const Inner msu = parseM2ua(message);
-        if (!msu.ok())
-            count(msu.skip);
-        else
-            mtp3(msu.bytes, sink);
-        return;
-    }
+    case Adaptation::M2ua:
     case Adaptation::M2pa: {
-        const Inner msu = parseM2pa(message);
+        const Inner msu = adaptation == Adaptation::M2ua ? parseM2ua(message) : parseM2pa(message);
         if (!msu.ok())
             count(msu.skip);
         else
