@@ -511,32 +511,23 @@ bool samePath(const Carrier &x, const Carrier &y) {
 
 bool isMtpLink(Link l) { return l == Link::Mtp2 || l == Link::Mtp2WithPhdr || l == Link::Mtp3; }
 
-std::uint32_t ppidOf(Adaptation a) {
+// Payload protocol id and well-known port of each adaptation.
+struct SctpUser {
+    std::uint32_t ppid;
+    std::uint16_t port;
+};
+SctpUser sctpUser(Adaptation a) {
     switch (a) {
     case Adaptation::M2ua:
-        return kPpidM2ua;
+        return {kPpidM2ua, kPortM2ua};
     case Adaptation::M2pa:
-        return kPpidM2pa;
+        return {kPpidM2pa, kPortM2pa};
     case Adaptation::Sua:
-        return kPpidSua;
+        return {kPpidSua, kPortSua};
     case Adaptation::M3ua:
         break;
     }
-    return kPpidM3ua;
-}
-
-std::uint16_t portOf(Adaptation a) {
-    switch (a) {
-    case Adaptation::M2ua:
-        return kPortM2ua;
-    case Adaptation::M2pa:
-        return kPortM2pa;
-    case Adaptation::Sua:
-        return kPortSua;
-    case Adaptation::M3ua:
-        break;
-    }
-    return kPortM3ua;
+    return {kPpidM3ua, kPortM3ua};
 }
 
 } // namespace
@@ -624,7 +615,7 @@ void FlowWriter::queue(const Bytes &userMessage, const Carrier &c) {
         side.streamSeq.resize(c.stream + 1u, 0);
     const std::uint16_t ssn = side.streamSeq[c.stream]++;
     const std::size_t piece = c.fragment ? c.fragment : userMessage.size();
-    const std::uint32_t ppid = c.ppid ? c.ppid : ppidOf(c.adaptation);
+    const std::uint32_t ppid = c.ppid ? c.ppid : sctpUser(c.adaptation).ppid;
     std::size_t at = 0;
     do {
         DataChunk chunk;
@@ -655,8 +646,8 @@ void FlowWriter::sendPackets(bool all) {
         const std::vector<DataChunk> chunks(pending_.begin() + static_cast<std::ptrdiff_t>(done),
                                             pending_.begin() + static_cast<std::ptrdiff_t>(done + n));
         done += n;
-        const std::uint16_t portA = c.portA ? c.portA : portOf(c.adaptation);
-        const std::uint16_t portB = c.portB ? c.portB : portOf(c.adaptation);
+        const std::uint16_t portA = c.portA ? c.portA : sctpUser(c.adaptation).port;
+        const std::uint16_t portB = c.portB ? c.portB : sctpUser(c.adaptation).port;
         const Bytes sctp = sctpPacket(b ? portB : portA, b ? portA : portB, kVtag[b], chunks);
         Bytes ip;
         if (c.ipv6) {
