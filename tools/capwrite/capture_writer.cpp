@@ -123,7 +123,9 @@ Bytes sccpXudt(View data, const SccpAddress &called, const SccpAddress &calling,
                const XudtSegment *segment) {
     const Bytes cd = sccpAddress(called, o.ansi), cg = sccpAddress(calling, o.ansi);
     const std::size_t toOptional = 4 + cd.size() + cg.size() + data.size();
-    checkFits(toOptional, 255, "XUDT data and addresses");
+    checkFits(data.size(), 255, "XUDT data");
+    if (segment) // the optional part's pointer is one octet too
+        checkFits(toOptional, 255, "XUDT data and addresses");
     Bytes b{0x11, protocolClass(o, segment ? 1 : 0), o.hopCounter, 4, static_cast<std::uint8_t>(4 + cd.size()),
             static_cast<std::uint8_t>(4 + cd.size() + cg.size()),
             static_cast<std::uint8_t>(segment ? toOptional : 0)};
