@@ -572,7 +572,7 @@ std::vector<Bytes> FlowWriter::userMessages(View tcap, const Carrier &c) {
         if (mtpLink || c.adaptation != Adaptation::M3ua) {
             const Bytes msu = mtp3(label, s);
             if (c.adaptation == Adaptation::M2pa && !mtpLink)
-                out.push_back(m2paData(msu, side_[!b].m2paFsn, side.m2paFsn++));
+                out.push_back(m2paData(msu, side_[!b].m2paFsn - 1, side.m2paFsn++)); // BSN: the peer's last
             else if (c.adaptation == Adaptation::M2ua && !mtpLink)
                 out.push_back(m2uaData(msu));
             else
@@ -599,7 +599,7 @@ void FlowWriter::message(View tcap, const Carrier &c) {
             } else {
                 if (link == Link::Mtp2WithPhdr)
                     frame = mtp2PseudoHeader(!c.reverse, 1);
-                append(frame, mtp2(msu, side.fsn, side_[!c.reverse].fsn));
+                append(frame, mtp2(msu, side.fsn, static_cast<std::uint8_t>(side_[!c.reverse].fsn - 1))); // BSN: the peer's last
                 side.fsn = (side.fsn + 1) & 0x7F;
             }
             emit(frame, c.intervalNs);
