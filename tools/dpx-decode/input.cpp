@@ -200,17 +200,20 @@ private:
         Sink sink;
         sink.reader = this;
         const auto start = std::chrono::steady_clock::now();
+        auto lastShown = start;
         bool shown = false;
         const CaptureResult r = readCaptureFile(f, [&](const Frame &frame) {
             origin_.frame = frame.number;
             origin_.seconds = frame.seconds;
             origin_.nanoseconds = frame.nanoseconds;
             walker_.walk(frame.linkType, capture::Bytes{frame.data, frame.size}, sink);
-            if (options_.progress && (frame.number & 0x3FFF) == 0) {
-                const auto elapsed = std::chrono::steady_clock::now() - start;
-                if (elapsed > std::chrono::seconds(1)) {
+            // After the first second, about five updates a second.
+            if (options_.progress && (frame.number & 0x3FF) == 0) {
+                const auto now = std::chrono::steady_clock::now();
+                if (now - start > std::chrono::seconds(1) && now - lastShown > std::chrono::milliseconds(200)) {
                     showProgress(name, frame.number, s);
                     shown = true;
+                    lastShown = now;
                 }
             }
         });
