@@ -13,8 +13,9 @@ fragmented, and times, on the same file, side by side:
     dpx-decode --summary        against  tshark (one line per frame)
 
 Output goes to /dev/null on both sides.  Prints wall time, messages per
-second, the ratio (tshark time / dpx-decode time) and the peak resident
-memory of each process; then dpx-decode's peak memory on a capture a tenth
+second, CPU time (user + system: steadier than wall time on a busy
+machine), the ratios (tshark / dpx-decode) and the peak resident memory of
+each process; then dpx-decode's peak memory on a capture a tenth
 the size, to show it does not grow with the capture.  The capture is kept
 in --workdir and reused while its parameters stay the same.
 
@@ -38,7 +39,8 @@ KEY_FIELDS = ['frame.number', 'tcap.otid', 'tcap.dtid', 'camel.present', 'camel.
 
 
 def run(cmd, env=None):
-    """-> (wall seconds, peak resident set in MiB, exit status)."""
+    """-> (wall seconds, CPU seconds (user + system), peak resident set in
+    MiB, exit status)."""
     start = time.perf_counter()
     proc = subprocess.Popen(cmd, stdout=subprocess.DEVNULL, stderr=subprocess.PIPE, env=env)
     _, status, usage = os.wait4(proc.pid, 0)
@@ -48,7 +50,7 @@ def run(cmd, env=None):
     proc.returncode = os.waitstatus_to_exitcode(status)
     if proc.returncode != 0:
         sys.stderr.write('capture_bench: %s exited %d: %s\n' % (cmd[0], proc.returncode, err.strip()[:300]))
-    return wall, usage.ru_maxrss / 1024.0, proc.returncode
+    return wall, usage.ru_utime + usage.ru_stime, usage.ru_maxrss / 1024.0, proc.returncode
 
 
 def write_flow(path, messages, seed):
@@ -126,19 +128,21 @@ def main(argv=None):
     ]
     print('\n%d messages in %s (%s)' % (a.messages, cap.name, subprocess.run(
         [a.tshark, '--version'], capture_output=True, text=True).stdout.splitlines()[0]))
-    print('%-8s %10s %10s %8s %12s %12s %12s' % ('pass', 'dpx-decode', 'tshark', 'ratio',
+    print('wall and CPU (user + system) seconds; ratio: tshark / dpx-decode')
+    print('%-8s %15s %15s %13s %12s %10s %10s' % ('pass', 'dpx-decode', 'tshark', 'ratio wall/CPU',
                                                   'msgs/s ours', 'RSS ours', 'RSS tshark'))
     failed = False
     for name, ours, theirs in pairs:
         if a.only and name not in a.only:
             continue
-        t_ours, m_ours, rc1 = run(ours)
-        t_theirs, m_theirs, rc2 = run(theirs, env)
+        t_ours, c_ours, m_ours, rc1 = run(ours)
+        t_theirs, c_theirs, m_theirs, rc2 = run(theirs, env)
         failed |= rc1 != 0 or rc2 != 0
-        print('%-8s %9.2fs %9.2fs %7.1fx %12.0f %9.1f MB %9.1f MB'
-              % (name, t_ours, t_theirs, t_theirs / t_ours, a.messages / t_ours, m_ours, m_theirs))
-    _, m_small, rc = run([a.decoder, '--pass', 'md', str(small)])
-    _, m_big, rc2 = run([a.decoder, '--pass', 'md', str(cap)])
+        print('%-8s %7.2f / %6.2f %7.2f / %6.2f %6.1fx/%5.1fx %12.0f %7.1f MB %7.1f MB'
+              % (name, t_ours, c_ours, t_theirs, c_theirs, t_theirs / t_ours,
+                 c_theirs / max(c_ours, 1e-3), a.messages / t_ours, m_ours, m_theirs))
+    _, _, m_small, rc = run([a.decoder, '--pass', 'md', str(small)])
+    _, _, m_big, rc2 = run([a.decoder, '--pass', 'md', str(cap)])
     failed |= rc != 0 or rc2 != 0
     print('dpx-decode --pass md peak memory: %.1f MB on %d messages, %.1f MB on %d'
           % (m_small, max(1, a.messages // 10), m_big, a.messages))
