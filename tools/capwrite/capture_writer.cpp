@@ -69,6 +69,14 @@ void checkFits(std::size_t n, std::size_t max, const char *what) {
                            std::to_string(max) + " fit");
 }
 
+// SCCP called and calling party addresses, each after its length octet.
+void putAddresses(Bytes &b, const Bytes &called, const Bytes &calling) {
+    put8(b, static_cast<unsigned>(called.size()));
+    append(b, called);
+    put8(b, static_cast<unsigned>(calling.size()));
+    append(b, calling);
+}
+
 std::uint16_t ipChecksum(View header) {
     std::uint32_t sum = 0;
     for (std::size_t i = 0; i + 1 < header.size(); i += 2)
@@ -110,10 +118,7 @@ Bytes sccpUdt(View data, const SccpAddress &called, const SccpAddress &calling, 
     // Each pointer counts from itself to the length octet of its part.
     Bytes b{0x09, protocolClass(o, 0), 3, static_cast<std::uint8_t>(3 + cd.size()),
             static_cast<std::uint8_t>(3 + cd.size() + cg.size())};
-    put8(b, static_cast<unsigned>(cd.size()));
-    append(b, cd);
-    put8(b, static_cast<unsigned>(cg.size()));
-    append(b, cg);
+    putAddresses(b, cd, cg);
     put8(b, static_cast<unsigned>(data.size()));
     append(b, data);
     return b;
@@ -129,10 +134,7 @@ Bytes sccpXudt(View data, const SccpAddress &called, const SccpAddress &calling,
     Bytes b{0x11, protocolClass(o, segment ? 1 : 0), o.hopCounter, 4, static_cast<std::uint8_t>(4 + cd.size()),
             static_cast<std::uint8_t>(4 + cd.size() + cg.size()),
             static_cast<std::uint8_t>(segment ? toOptional : 0)};
-    put8(b, static_cast<unsigned>(cd.size()));
-    append(b, cd);
-    put8(b, static_cast<unsigned>(cg.size()));
-    append(b, cg);
+    putAddresses(b, cd, cg);
     put8(b, static_cast<unsigned>(data.size()));
     append(b, data);
     if (segment) {
@@ -176,10 +178,7 @@ Bytes sccpLudt(View data, const SccpAddress &called, const SccpAddress &calling,
     put16le(b, static_cast<unsigned>(p2));
     put16le(b, static_cast<unsigned>(p3));
     put16le(b, 0);
-    put8(b, static_cast<unsigned>(cd.size()));
-    append(b, cd);
-    put8(b, static_cast<unsigned>(cg.size()));
-    append(b, cg);
+    putAddresses(b, cd, cg);
     put16le(b, static_cast<unsigned>(data.size()));
     append(b, data);
     return b;
