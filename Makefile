@@ -3,9 +3,11 @@
 #   make deps    install the Debian packages the build needs (root or sudo),
 #                qemu-user too where 32-bit x86 programs do not run natively
 #   make build   configure and build the native preset (build/native)
-#   make demo    deps + build, then decode the bundled sample messages
+#   make demo    deps + build, then decode the bundled sample messages and a
+#                sample capture
 #   make test    deps, then build and test the native, asan and m32 presets
 #   make bench   build, then run the benchmarks
+#   make bench-capture   build, then dpx-decode against tshark on a capture
 #   make clean   remove build/
 
 SHELL := /bin/bash
@@ -13,7 +15,8 @@ SHELL := /bin/bash
 
 PRESETS := native asan m32
 DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
-                libbenchmark-dev nlohmann-json3-dev libcli11-dev tshark python3
+                libbenchmark-dev nlohmann-json3-dev libcli11-dev libpcap-dev tshark \
+                python3
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 APT_INSTALL := $(SUDO) apt-get update -qq; \
                $(SUDO) env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends
@@ -28,7 +31,9 @@ M32_CHECK := m32=$$($(M32_RUNNER) 2>&1) || { echo "make test: $$m32" >&2; exit 1
              [ "$$m32" = native ] && m32=natively || m32="under $$m32"
 
 SAMPLES := $(sort $(wildcard samples/*.txt))
-DEMO_ARGS ?= $(SAMPLES)
+# A call flow over Ethernet/IPv4/SCTP/M3UA/SCCP (samples/callflow.hex).
+DEMO_CAPTURES := samples/callflow-m3ua.pcap
+DEMO_ARGS ?= $(SAMPLES) $(DEMO_CAPTURES)
 
 .PHONY: deps build demo test bench clean $(addprefix test-,$(PRESETS))
 
@@ -85,6 +90,13 @@ bench: build
 	    || { echo "make bench: camel_bench not built (bench/ or Google Benchmark missing)" >&2; exit 1; }
 	build/native/camel_bench
 
+# dpx-decode against tshark on one capture of BENCH_MESSAGES CAMEL messages
+# (bench/capture_bench.py; needs tshark and ../shared/tools).
+BENCH_MESSAGES ?= 100000
+.PHONY: bench-capture
+bench-capture: build
+	python3 bench/capture_bench.py --messages $(BENCH_MESSAGES)
+
 clean:
 	rm -rf build
 
@@ -97,8 +109,19 @@ FUZZ_PACKAGES := clang libclang-rt-14-dev
 FUZZ_TIME ?= 300
 FUZZ_ARGS ?= -max_len=512 -dict=fuzz/camel.dict
 
-.PHONY: fuzz
-fuzz: deps
+.PHONY: fuzz fuzz-capture fuzz-tools
+fuzz: fuzz-tools
+	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
+	    $(FUZZ_ARGS) build/fuzz/corpus build/fuzz/seeds fuzz/corpus
+
+# make fuzz-capture: capture_fuzz, dpx-decode's frame walker (link layer to
+# TCAP message), over build/fuzz/capture-corpus and seeds from samples/*.pcap.
+fuzz-capture: fuzz-tools
+	mkdir -p build/fuzz/capture-corpus
+	build/fuzz/capture_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
+	    -max_len=4096 build/fuzz/capture-corpus build/fuzz/capture-seeds
+
+fuzz-tools: deps
 	@missing=""; \
 	for pkg in $(FUZZ_PACKAGES); do \
 	    dpkg -s "$$pkg" 2>/dev/null | grep -q '^Status: install ok installed' \
@@ -109,7 +132,5 @@ fuzz: deps
 	    $(APT_INSTALL) $$missing; \
 	fi
 	cmake --preset fuzz
-	cmake --build --preset fuzz
+	cmake --build --preset fuzz -j2
 	mkdir -p build/fuzz/corpus
-	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
-	    $(FUZZ_ARGS) build/fuzz/corpus build/fuzz/seeds fuzz/corpus

@@ -16,6 +16,7 @@
 
 #include "../../tools/dpx-decode/hex_line.h"
 #include "../../tools/dpx-decode/key_layout.h"
+#include "support/dpx_decode_run.h"
 
 namespace {
 
@@ -48,60 +49,10 @@ TEST(DpxDecodeKeys, PresentEntriesAreReadInTheirStoredFormWithinTheBuffer) {
                           "30:/0"}));
 }
 
-struct Outcome {
-    int status = -1; // exit status, or -1 when it did not exit normally
-    std::string out, err;
-    Lines lines() const {
-        Lines l;
-        std::istringstream in(out);
-        for (std::string s; std::getline(in, s);)
-            l.push_back(s);
-        return l;
-    }
-    std::vector<json> objects() const {
-        std::vector<json> o;
-        for (const std::string &l : lines())
-            o.push_back(json::parse(l));
-        return o;
-    }
-};
-
-std::string quote(const std::string &s) {
-    std::string q = "'";
-    for (char c : s)
-        q += c == '\'' ? std::string("'\\''") : std::string(1, c);
-    return q + "'";
-}
-
-std::string tempFile(const std::string &name, const std::string &content) {
-    const std::string path = ::testing::TempDir() + "dpx_decode_" +
-                             ::testing::UnitTest::GetInstance()->current_test_info()->name() + "_" + name;
-    std::ofstream(path, std::ios::binary) << content;
-    return path;
-}
-
-// Runs dpx-decode with `args` (quoted as needed), standard input from `input`;
-// under the build's emulator where this machine cannot execute its programs.
-Outcome run(const std::string &args, const std::string &input = "") {
-    const std::string errPath = tempFile("stderr", "");
-    const std::string emulator = DPX_TEST_EMULATOR;
-    const std::string command = (emulator.empty() ? "" : quote(emulator) + " ") +
-                                quote(DPX_BUILD_DIR "/dpx-decode") + " " + args + " <" +
-                                quote(tempFile("stdin", input)) + " 2>" + quote(errPath);
-    Outcome r;
-    FILE *p = popen(command.c_str(), "r");
-    if (p == nullptr)
-        return r;
-    char buf[4096];
-    for (size_t n; (n = fread(buf, 1, sizeof buf, p)) > 0;)
-        r.out.append(buf, n);
-    const int st = pclose(p);
-    r.status = WIFEXITED(st) ? WEXITSTATUS(st) : -1;
-    std::ostringstream err;
-    err << std::ifstream(errPath).rdbuf();
-    r.err = err.str();
-    return r;
-}
+using dpxtest::Outcome;
+using dpxtest::quote;
+using dpxtest::run;
+using dpxtest::tempFile;
 
 TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
     const std::string samples = DPX_SOURCE_DIR "/samples/messages.txt";

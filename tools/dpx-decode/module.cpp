@@ -14,21 +14,6 @@ namespace {
 
 constexpr const char *kModuleFile = "3gpp_camel_400_DLL.so";
 
-struct StateDeleter {
-    void operator()(DecodeState *s) const { host_FreeState(s); }
-};
-using StatePtr = std::unique_ptr<DecodeState, StateDeleter>;
-
-// A request as the host fills it for one pre-decode call: one output line,
-// one layer entry.
-struct PreRequest {
-    PreDecodeRequest rq{};
-    explicit PreRequest(DecodeState *st) { host_InitRequest(&rq, st, 1, 0); }
-    ~PreRequest() { host_FreeRequest(&rq); }
-    PreRequest(const PreRequest &) = delete;
-    PreRequest &operator=(const PreRequest &) = delete;
-};
-
 template <typename F>
 bool resolve(void *handle, const char *name, F &fn, std::string &error) {
     void *sym = dlsym(handle, name);
@@ -42,83 +27,30 @@ bool resolve(void *handle, const char *name, F &fn, std::string &error) {
 
 void collectDecoded(MdOut &out) {
     const uint32_t n = host_DecodedCount();
-    out.fields.reserve(n);
+    // Resized, not cleared: the strings and span vectors of the entries
+    // that stay keep their capacity from message to message.
+    out.fields.resize(n);
     for (uint32_t i = 0; i < n; ++i) {
         const HostDecodedField *f = host_Decoded(i);
-        DecodedOut d;
+        DecodedOut &d = out.fields[i];
         d.id = f->fieldId;
-        d.label = f->label;
-        d.text = f->text;
+        d.label.assign(f->label);
+        d.text.assign(f->text);
         d.selector = f->selector;
-        d.spans.reserve(f->spanCount);
+        d.spans.resize(f->spanCount);
         for (uint32_t k = 0; k < f->spanCount; ++k)
-            d.spans.push_back(SpanOut{f->spans[k].firstBit, f->spans[k].lastBit, f->spans[k].value});
-        out.fields.push_back(std::move(d));
+            d.spans[k] = SpanOut{f->spans[k].firstBit, f->spans[k].lastBit, f->spans[k].value};
     }
 }
 
 void collectDisplay(DisplayPassOut &out) {
     const uint32_t n = host_DisplayCount();
-    out.fields.reserve(n);
+    out.fields.resize(n);
     for (uint32_t i = 0; i < n; ++i) {
         const HostDisplayField *f = host_Display(i);
-        out.fields.push_back(DisplayOut{f->displayId, f->text});
+        out.fields[i].displayId = f->displayId;
+        out.fields[i].text.assign(f->text);
     }
-}
-
-MdOut runMd(const Module &m, DecodeState *st) {
-    MdOut out;
-    host_ResetState(st);
-    host_ClearRecords();
-    PreRequest req(st);
-    out.result = m.preDecodeMD(&req.rq);
-    out.remainingBits = req.rq.remainingBits;
-    out.errorFlags = st->errorFlags;
-    out.layerFirst = req.rq.layerEntries[0].firstBit;
-    out.layerLast = req.rq.layerEntries[0].lastBit;
-    collectDecoded(out);
-    host_ClearRecords();
-    return out;
-}
-
-DisplayPassOut runDisplay(const Module &m, DecodeState *st) {
-    DisplayPassOut out;
-    host_ResetState(st);
-    host_ClearRecords();
-    PreRequest req(st);
-    out.result = m.preDecodeTO(&req.rq);
-    out.remainingBits = req.rq.remainingBits;
-    out.errorFlags = st->errorFlags;
-    collectDisplay(out);
-    host_ClearRecords();
-    return out;
-}
-
-ViewOut runView(const Module &m, DecodeState *st) {
-    ViewOut out;
-    host_ResetState(st);
-    PreRequest req(st);
-    out.result = m.preDecodeMV(&req.rq);
-    out.remainingBits = req.rq.remainingBits;
-    out.errorFlags = st->errorFlags;
-    out.status = req.rq.status;
-    return out;
-}
-
-KeysOut runKeys(const Module &m, DecodeState *st) {
-    KeysOut out;
-    host_ResetState(st);
-    std::vector<uint8_t> buffer(kKeyBufferSize, 0);
-    KeyFieldRequest rq{};
-    rq.keyBuffer = buffer.data();
-    rq.dataOffset = HOST_KEY_DATA_START;
-    rq.valueRoom = kKeyBufferSize - HOST_KEY_DATA_START;
-    rq.state = st;
-    out.result = m.keyFields(&rq);
-    out.remainingBits = rq.remainingBits;
-    out.errorFlags = st->errorFlags;
-    out.entries = readKeyEntries(buffer.data(), kKeyBufferSize);
-    return out;
 }
 
 } // namespace
@@ -162,21 +94,104 @@ bool loadModule(const std::string &path, Module &module, std::string &error) {
     return true;
 }
 
-bool runPasses(const Module &module, const std::vector<uint8_t> &message,
-               const PassSelection &passes, MessageResult &out) {
-    StatePtr st(host_NewState(message.data(), static_cast<uint32_t>(message.size())));
-    if (!st)
-        return false;
-    out = MessageResult{};
-    if (passes.md)
-        out.md = runMd(module, st.get());
-    if (passes.display)
-        out.display = runDisplay(module, st.get());
-    if (passes.view)
-        out.view = runView(module, st.get());
-    if (passes.keys)
-        out.keys = runKeys(module, st.get());
-    return true;
+Session::Session(const Module &module) : module_(module), keyBuffer_(kKeyBufferSize, 0) {
+    state_ = host_NewState(nullptr, 0);
+    if (state_ == nullptr)
+        return;
+    ownBuffer_ = state_->buffer;
+    host_InitRequest(&request_, state_, 1, 0);
+}
+
+Session::~Session() {
+    if (state_ == nullptr)
+        return;
+    host_FreeRequest(&request_);
+    state_->buffer = ownBuffer_;
+    host_FreeState(state_);
+}
+
+// The request as host_InitRequest leaves it, in the arrays it allocated (a
+// pass may have grown the layer entries: they are kept, only one is
+// offered).
+void Session::prepareRequest() {
+    char *lines = request_.outputLines;
+    LayerInfoEntry *entries = request_.layerEntries;
+    const uint32_t entryCount = request_.layerLimit + 1;
+    std::memset(lines, 0, DPX_OUTPUT_LINE_SIZE);
+    std::memset(entries, 0, entryCount * sizeof *entries);
+    std::memset(&request_, 0, sizeof request_);
+    request_.outputLines = lines;
+    request_.layerEntries = entries;
+    request_.state = state_;
+}
+
+void Session::runMd(MdOut &out) {
+    host_ResetState(state_);
+    host_ClearRecords();
+    prepareRequest();
+    out.result = module_.preDecodeMD(&request_);
+    out.remainingBits = request_.remainingBits;
+    out.errorFlags = state_->errorFlags;
+    out.layerFirst = request_.layerEntries[0].firstBit;
+    out.layerLast = request_.layerEntries[0].lastBit;
+    collectDecoded(out);
+    host_ClearRecords();
+}
+
+void Session::runDisplay(DisplayPassOut &out) {
+    host_ResetState(state_);
+    host_ClearRecords();
+    prepareRequest();
+    out.result = module_.preDecodeTO(&request_);
+    out.remainingBits = request_.remainingBits;
+    out.errorFlags = state_->errorFlags;
+    collectDisplay(out);
+    host_ClearRecords();
+}
+
+void Session::runView(ViewOut &out) {
+    host_ResetState(state_);
+    prepareRequest();
+    out.result = module_.preDecodeMV(&request_);
+    out.remainingBits = request_.remainingBits;
+    out.errorFlags = state_->errorFlags;
+    out.status = request_.status;
+}
+
+void Session::runKeys(KeysOut &out) {
+    host_ResetState(state_);
+    std::fill(keyBuffer_.begin(), keyBuffer_.end(), 0);
+    KeyFieldRequest rq{};
+    rq.keyBuffer = keyBuffer_.data();
+    rq.dataOffset = HOST_KEY_DATA_START;
+    rq.valueRoom = kKeyBufferSize - HOST_KEY_DATA_START;
+    rq.state = state_;
+    out.result = module_.keyFields(&rq);
+    out.remainingBits = rq.remainingBits;
+    out.errorFlags = state_->errorFlags;
+    out.entries = readKeyEntries(keyBuffer_.data(), kKeyBufferSize);
+}
+
+void Session::run(const uint8_t *message, size_t size, const PassSelection &passes, MessageResult &out) {
+    // The state reads the caller's bytes; its own buffer is put back before
+    // it is freed.
+    state_->buffer = message;
+    state_->totalBits = static_cast<uint32_t>(size * 8);
+    const auto select = [](bool wanted, auto &slot) {
+        if (!wanted)
+            slot.reset();
+        else if (!slot)
+            slot.emplace();
+        return wanted;
+    };
+    if (select(passes.md, out.md))
+        runMd(*out.md);
+    if (select(passes.display, out.display))
+        runDisplay(*out.display);
+    if (select(passes.view, out.view))
+        runView(*out.view);
+    if (select(passes.keys, out.keys))
+        runKeys(*out.keys);
 }
 
 } // namespace dpxdecode

@@ -92,9 +92,37 @@ struct MessageResult {
     std::optional<KeysOut> keys;
 };
 
-// Runs the selected passes over `message`, each on a freshly prepared
-// decoding state.  Returns false only when the host cannot allocate a state.
-bool runPasses(const Module &module, const std::vector<uint8_t> &message,
-               const PassSelection &passes, MessageResult &out);
+// One decoding state, one request and one key buffer, prepared once and
+// used for message after message: each pass starts from host_ResetState and
+// a request as host_InitRequest leaves it (one output line, one layer
+// entry), without allocating anything per message.
+class Session {
+public:
+    explicit Session(const Module &module);
+    ~Session();
+    Session(const Session &) = delete;
+    Session &operator=(const Session &) = delete;
+
+    // False when the host could not allocate the state.
+    bool ok() const { return state_ != nullptr; }
+
+    // Runs the selected passes over `message` (which must stay valid during
+    // the call).  `out` is filled in place; the passes not selected are
+    // reset.
+    void run(const uint8_t *message, size_t size, const PassSelection &passes, MessageResult &out);
+
+private:
+    void prepareRequest();
+    void runMd(MdOut &out);
+    void runDisplay(DisplayPassOut &out);
+    void runView(ViewOut &out);
+    void runKeys(KeysOut &out);
+
+    const Module &module_;
+    DecodeState *state_ = nullptr;
+    const uint8_t *ownBuffer_ = nullptr; // the state's own (empty) message buffer
+    PreDecodeRequest request_{};
+    std::vector<uint8_t> keyBuffer_;
+};
 
 } // namespace dpxdecode

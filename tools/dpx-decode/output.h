@@ -5,6 +5,7 @@
 #include <iosfwd>
 #include <string>
 
+#include "input.h"
 #include "module.h"
 
 namespace dpxdecode {
@@ -15,11 +16,17 @@ struct TextOptions {
 
 // Header line, decoded-field lines, display count, message-view verdict and
 // key fields, followed by a blank line.
+// A message of a capture is headed by a line saying where it was found.
 void writeText(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r,
-               const TextOptions &options);
+               const TextOptions &options, const CaptureOrigin *origin = nullptr);
 
-// One JSON object on one line.
-void writeJson(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r);
+// One JSON object on one line; a message of a capture has the members
+// frame, time, opc, dpc, calledSsn and callingSsn after hex.
+void writeJson(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r,
+               const CaptureOrigin *origin = nullptr);
+
+// "SECONDS.NANOSECONDS", nine digits after the point.
+std::string formatTime(int64_t seconds, uint32_t nanoseconds);
 
 // Names of the error flags set in `flags`, comma-separated; unknown bits
 // as hexadecimal.

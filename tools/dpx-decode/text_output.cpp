@@ -1,9 +1,38 @@
+#include <charconv>
+#include <cstdio>
 #include <ostream>
+#include <string>
+#include <type_traits>
 
 #include "output.h"
 
 namespace dpxdecode {
 namespace {
+
+// A message's text is put together in one reused string and written at
+// once, rather than a stream insertion per value.
+struct Text {
+    std::string s;
+    Text &operator<<(const std::string &v) {
+        s += v;
+        return *this;
+    }
+    Text &operator<<(const char *v) {
+        s += v;
+        return *this;
+    }
+    Text &operator<<(char v) {
+        s += v;
+        return *this;
+    }
+    template <typename T, typename = std::enable_if_t<std::is_integral_v<T>>>
+    Text &operator<<(T v) {
+        char buf[24];
+        const auto r = std::to_chars(buf, buf + sizeof buf, v);
+        s.append(buf, size_t(r.ptr - buf));
+        return *this;
+    }
+};
 
 struct FlagName {
     uint32_t bit;
@@ -30,7 +59,7 @@ std::string hex32(uint32_t v) {
 }
 
 // A pass that did not finish says so on its own line.
-void writeFailure(std::ostream &os, const char *pass, const PassOutcome &p) {
+void writeFailure(Text &os, const char *pass, const PassOutcome &p) {
     if (p.result == 1)
         return;
     os << pass << ": pass failed (result " << p.result;
@@ -39,7 +68,7 @@ void writeFailure(std::ostream &os, const char *pass, const PassOutcome &p) {
     os << ")\n";
 }
 
-void writeVerdict(std::ostream &os, const ViewOut &v) {
+void writeVerdict(Text &os, const ViewOut &v) {
     const bool valid = v.result == 1 && v.errorFlags == 0 && v.status == 0;
     os << "view: " << (valid ? "valid" : "invalid");
     if (v.errorFlags != 0)
@@ -50,7 +79,7 @@ void writeVerdict(std::ostream &os, const ViewOut &v) {
     os << '\n';
 }
 
-void writeKeys(std::ostream &os, const KeysOut &k) {
+void writeKeys(Text &os, const KeysOut &k) {
     if (k.entries.empty()) {
         os << "keys: none\n";
         return;
@@ -87,8 +116,35 @@ std::string describeErrorFlags(uint32_t flags) {
     return s;
 }
 
-void writeText(std::ostream &os, uint64_t index, const std::string &hex, const MessageResult &r,
-               const TextOptions &options) {
+std::string formatTime(int64_t seconds, uint32_t nanoseconds) {
+    char buf[48];
+    std::snprintf(buf, sizeof buf, "%lld.%09u", static_cast<long long>(seconds), nanoseconds);
+    return buf;
+}
+
+void writeText(std::ostream &stream, uint64_t index, const std::string &hex, const MessageResult &r,
+               const TextOptions &options, const CaptureOrigin *origin) {
+    static thread_local Text os;
+    os.s.clear();
+    if (origin != nullptr) {
+        const capture::TcapMessage &c = origin->carrier;
+        os << "frame " << origin->frame << " at " << formatTime(origin->seconds, origin->nanoseconds);
+        if (c.hasPointCodes)
+            os << ": opc " << c.opc << ", dpc " << c.dpc;
+        else
+            os << ": no point codes";
+        os << ", called SSN ";
+        if (c.hasCalledSsn)
+            os << unsigned(c.calledSsn);
+        else
+            os << '-';
+        os << ", calling SSN ";
+        if (c.hasCallingSsn)
+            os << unsigned(c.callingSsn);
+        else
+            os << '-';
+        os << '\n';
+    }
     os << "message " << index << ": " << hex << '\n';
     if (r.md) {
         for (const DecodedOut &f : r.md->fields) {
@@ -113,6 +169,7 @@ void writeText(std::ostream &os, uint64_t index, const std::string &hex, const M
         writeFailure(os, "keys", *r.keys);
     }
     os << '\n';
+    stream.write(os.s.data(), std::streamsize(os.s.size()));
 }
 
 } // namespace dpxdecode

@@ -1,0 +1,188 @@
+// dpx-decode on capture files built in memory with the capture writer:
+// where each message came from in text and JSON, --summary and --stats,
+// standard input, captures without CAMEL traffic, and damaged captures
+// (every frame before the damage decoded, then exit status 3 with the
+// frame number).
+
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+
+#include <cstdio>
+#include <fstream>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "capture_writer.h"
+#include "support/dpx_decode_run.h"
+
+namespace {
+
+namespace cw = capwrite;
+using cw::Bytes;
+using nlohmann::json;
+using Lines = std::vector<std::string>;
+
+const Bytes kBegin{0x62, 0x06, 0x48, 0x04, 0x01, 0x02, 0x03, 0x04};
+const Bytes kEnd{0x64, 0x06, 0x49, 0x04, 0x01, 0x02, 0x03, 0x04};
+constexpr uint64_t kStart = 1767225600ull * 1000000000ull; // 2026-01-01
+
+using dpxtest::Outcome;
+using dpxtest::quote;
+
+std::string tempFile(const std::string &name, const Bytes &content) {
+    return dpxtest::tempFile(name, std::string(content.begin(), content.end()));
+}
+
+Outcome run(const std::string &args, const Bytes &input = {}) {
+    return dpxtest::run(args, std::string(input.begin(), input.end()));
+}
+
+// Frame i carries `messages[i]` (empty: an ARP frame) over
+// Ethernet/IPv4/SCTP/M3UA/SCCP UDT, one millisecond apart.
+Bytes capture(const std::vector<Bytes> &messages, cw::FileFormat format = cw::FileFormat::Pcap) {
+    std::vector<std::pair<uint64_t, Bytes>> frames;
+    const cw::Mac a{{2, 0, 0, 0, 0, 1}}, b{{2, 0, 0, 0, 0, 2}};
+    const cw::RoutingLabel label{100, 200, 0, 2, false};
+    for (size_t i = 0; i < messages.size(); ++i) {
+        Bytes frame;
+        if (messages[i].empty()) {
+            frame = cw::ethernet(b, a, 0x0806, Bytes(28, 0));
+        } else {
+            cw::DataChunk c;
+            c.tsn = uint32_t(i + 1);
+            c.ppid = cw::kPpidM3ua;
+            c.data = cw::m3uaData(label, cw::sccpUdt(messages[i], {146, false, 0}, {147, false, 0}, {}));
+            frame = cw::ethernet(b, a, cw::kEtherIpv4,
+                                 cw::ipv4({{10, 0, 0, 1}}, {{10, 0, 0, 2}}, cw::kIpProtoSctp,
+                                          cw::sctpPacket(2905, 2905, 1, {c}), uint16_t(i)));
+        }
+        frames.emplace_back(kStart + i * 1000000, frame);
+    }
+    return cw::captureBytes({format, cw::Link::Ethernet, false, 0}, frames);
+}
+
+class DpxDecodeCapture : public ::testing::Test {
+protected:
+    void SetUp() override {
+        if (!DPX_HAVE_PCAP)
+            GTEST_SKIP() << "dpx-decode built without libpcap";
+    }
+};
+
+TEST_F(DpxDecodeCapture, JsonAndTextSayWhereEachMessageCameFrom) {
+    for (const cw::FileFormat format : {cw::FileFormat::Pcap, cw::FileFormat::Pcapng}) {
+        const std::string file = tempFile("two", capture({{}, kBegin, kEnd}, format));
+        const Outcome j = run("--format json --pass view " + quote(file));
+        ASSERT_EQ(j.status, 0) << j.err;
+        const Lines lines = j.lines();
+        ASSERT_EQ(lines.size(), 2u);
+        const auto first = nlohmann::ordered_json::parse(lines[0]);
+        Lines members;
+        for (const auto &item : first.items())
+            members.push_back(item.key());
+        EXPECT_EQ(members, (Lines{"index", "hex", "frame", "time", "opc", "dpc", "calledSsn", "callingSsn", "view"}));
+        EXPECT_EQ(first["frame"], 2);
+        EXPECT_EQ(first["time"], "1767225600.001000000");
+        EXPECT_EQ(first["opc"], 100);
+        EXPECT_EQ(first["dpc"], 200);
+        EXPECT_EQ(first["calledSsn"], 146);
+        EXPECT_EQ(first["callingSsn"], 147);
+        EXPECT_EQ(first["hex"], "6206480401020304");
+        EXPECT_EQ(json::parse(lines[1])["index"], 1);
+
+        const Outcome t = run("--pass view " + quote(file));
+        ASSERT_EQ(t.status, 0) << t.err;
+        EXPECT_EQ(t.out, "frame 2 at 1767225600.001000000: opc 100, dpc 200, called SSN 146, calling SSN 147\n"
+                         "message 0: 6206480401020304\nview: valid\n\n"
+                         "frame 3 at 1767225600.002000000: opc 100, dpc 200, called SSN 146, calling SSN 147\n"
+                         "message 1: 6406490401020304\nview: valid\n\n");
+    }
+}
+
+TEST_F(DpxDecodeCapture, StandardInputMayHoldACaptureOrHex) {
+    const Outcome c = run("--pass view -", capture({kBegin}));
+    EXPECT_EQ(c.status, 0) << c.err;
+    EXPECT_NE(c.out.find("frame 1 at "), std::string::npos) << c.out;
+    const std::string hex = "6206480401020304\n";
+    const Outcome h = run("--pass view", Bytes(hex.begin(), hex.end()));
+    EXPECT_EQ(h.status, 0) << h.err;
+    EXPECT_EQ(h.out, "message 0: 6206480401020304\nview: valid\n\n");
+}
+
+TEST_F(DpxDecodeCapture, SummaryAndStatistics) {
+    const std::string file = tempFile("flow", capture({kBegin, {}, kEnd}));
+    const Outcome s = run("--summary " + quote(file));
+    ASSERT_EQ(s.status, 0) << s.err;
+    EXPECT_EQ(s.out, "frame 1 1767225600.000000000 Begin otid=01020304 dtid=-\n"
+                     "frame 3 1767225600.002000000 End otid=- dtid=01020304\n");
+    const Outcome st = run("--stats --pass view " + quote(file));
+    ASSERT_EQ(st.status, 0) << st.err;
+    const Lines l = st.lines();
+    ASSERT_GE(l.size(), 4u);
+    EXPECT_EQ(Lines(l.end() - 4, l.end()), (Lines{"stats: 3 frames, 2 messages", "message type Begin: 1",
+                                                  "message type End: 1", "skipped link: neither IP nor SS7: 1"}));
+    const Outcome sj = run("--stats --summary --format json " + quote(file));
+    ASSERT_EQ(sj.status, 0) << sj.err;
+    const json stats = json::parse(sj.lines().back())["stats"];
+    EXPECT_EQ(stats["frames"], 3);
+    EXPECT_EQ(stats["messageTypes"], json::parse(R"({"Begin":1,"End":1})"));
+}
+
+TEST_F(DpxDecodeCapture, CaptureWithoutCamelTrafficDecodesNothing) {
+    const std::string file = tempFile("arp", capture({{}, {}}));
+    const Outcome r = run(quote(file));
+    EXPECT_EQ(r.status, 0) << r.err;
+    EXPECT_EQ(r.out, "");
+    EXPECT_EQ(r.err, "");
+}
+
+TEST_F(DpxDecodeCapture, DamagedCaptureDecodesTheFramesBeforeAndExitsWithThree) {
+    const Bytes whole = capture({kBegin, kEnd, kBegin});
+    const Bytes twoFrames = capture({kBegin, kEnd});
+    const Bytes oneFrame = capture({kBegin});
+    Bytes badLength = twoFrames;
+    // The second record's captured length (at 16 + header + data + 8) far
+    // beyond any snap length.
+    const size_t secondRecord = oneFrame.size();
+    badLength[secondRecord + 8] = 0xFF;
+    badLength[secondRecord + 9] = 0xFF;
+    badLength[secondRecord + 10] = 0xFF;
+    const struct {
+        const char *name;
+        Bytes file;
+        size_t messages;
+        const char *frame;
+    } cases[] = {
+        {"cut in the third record header", Bytes(whole.begin(), whole.begin() + long(twoFrames.size() + 5)), 2,
+         "frame 3: "},
+        {"cut in the third frame", Bytes(whole.begin(), whole.end() - 7), 2, "frame 3: "},
+        {"second record too long", badLength, 1, "frame 2: "},
+        {"cut in the file header", Bytes(whole.begin(), whole.begin() + 10), 0, "frame 1: "},
+    };
+    for (const auto &c : cases) {
+        SCOPED_TRACE(c.name);
+        const std::string file = tempFile("damaged", c.file);
+        const Outcome r = run("--pass view " + quote(file));
+        EXPECT_EQ(r.status, 3) << r.err;
+        EXPECT_EQ(r.lines().size(), 4 * c.messages); // frame, message, verdict, blank
+        EXPECT_NE(r.err.find("dpx-decode: " + file + ": " + c.frame), std::string::npos) << r.err;
+    }
+    // The next file is still read, as a capture of its own (same TSNs); the
+    // exit status stays 3.
+    const std::string good = tempFile("good", oneFrame);
+    const Outcome r = run("--pass view " + quote(tempFile("cut", Bytes(whole.begin(), whole.end() - 1))) + " " +
+                          quote(good));
+    EXPECT_EQ(r.status, 3);
+    EXPECT_EQ(r.lines().size(), 4u * 3);
+}
+
+TEST_F(DpxDecodeCapture, BadSsnListIsAUsageError) {
+    for (const char *list : {"x", "300", "5-2", "1,", "-3"}) {
+        const Outcome r = run(std::string("--ssn ") + quote(list) + " --hex 62");
+        EXPECT_EQ(r.status, 64) << list;
+    }
+    EXPECT_EQ(run("--ssn 6-8,146 --hex 6206480401020304 --pass view").status, 0);
+}
+
+} // namespace
