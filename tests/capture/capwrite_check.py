@@ -101,7 +101,7 @@ def check_carrier(tshark, capwrite, name, opts, msgs, tmp):
     src.write_text('\n'.join(msgs) + '\n')
     fmt = 'pcapng' if 'pcapng' in opts else 'pcap'
     path = tmp / ('out.' + fmt)
-    subprocess.run([capwrite, '-o', str(path), '--time', str(START), '--interval', str(INTERVAL_US)]
+    subprocess.run(capwrite + ['-o', str(path), '--time', str(START), '--interval', str(INTERVAL_US)]
                    + opts + [str(src)], check=True)
     frames = tshark_read(tshark, path, '--ansi' in opts)
     faults = []
@@ -132,7 +132,7 @@ def check_snaplen(tshark, capwrite, msgs, tmp):
     faults = []
     for fmt in ('pcap', 'pcapng'):
         path = tmp / ('cut.' + fmt)
-        subprocess.run([capwrite, '-o', str(path), '--format', fmt, '--snaplen', '60', str(src)], check=True)
+        subprocess.run(capwrite + ['-o', str(path), '--format', fmt, '--snaplen', '60', str(src)], check=True)
         fields, _ = tshark_read(tshark, path, False)[0]
         cap, whole = int(fields['frame.cap_len'][0]), int(fields['frame.len'][0])
         if cap != 60 or whole <= 60:
@@ -144,7 +144,7 @@ def check_samples(capwrite, tmp):
     faults = []
     for name, opts in SAMPLES:
         path = tmp / name
-        subprocess.run([capwrite, '-o', str(path)] + opts + [str(ROOT / 'samples' / 'callflow.hex')], check=True)
+        subprocess.run(capwrite + ['-o', str(path)] + opts + [str(ROOT / 'samples' / 'callflow.hex')], check=True)
         if path.read_bytes() != (ROOT / 'samples' / name).read_bytes():
             faults.append('samples/%s differs from what capwrite writes now from samples/callflow.hex '
                           '(tests/capture/capwrite_check.py --regenerate)' % name)
@@ -154,15 +154,17 @@ def check_samples(capwrite, tmp):
 def main(argv=None):
     ap = argparse.ArgumentParser(description=__doc__.split('\n\n')[0])
     ap.add_argument('--capwrite', required=True)
+    ap.add_argument('--emulator', default='', help='runs capwrite (a build for another machine)')
     ap.add_argument('--tshark', default=os.environ.get('TSHARK', 'tshark'))
     what = ap.add_mutually_exclusive_group(required=True)
     what.add_argument('--samples', action='store_true')
     what.add_argument('--tshark-check', action='store_true')
     what.add_argument('--regenerate', action='store_true', help='rewrite the sample captures')
     a = ap.parse_args(argv)
+    a.capwrite = ([a.emulator] if a.emulator else []) + [a.capwrite]
     if a.regenerate:
         for name, opts in SAMPLES:
-            subprocess.run([a.capwrite, '-o', str(ROOT / 'samples' / name)] + opts
+            subprocess.run(a.capwrite + ['-o', str(ROOT / 'samples' / name)] + opts
                            + [str(ROOT / 'samples' / 'callflow.hex')], check=True)
         return 0
     tmp = Path(tempfile.mkdtemp(prefix='capwrite-check-'))
