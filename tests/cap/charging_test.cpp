@@ -132,6 +132,12 @@ TEST(Charging, ArgumentsFieldByField) {
         {"Information To Send, unknown alternative", 47, "30 06 A0 04 A2 02 80 00",
          {"Sequence Tag=30", "  LENGTH=6 octet(s)", "Information To Send Tag=a0", "  LENGTH=4 octet(s)", "Choice="},
          DPX_ERR_LEFTOVER},
+        // A basic gap criterion names only the four basic alternatives.
+        {"Compound criteria nested in a basic criterion", 41, "30 08 A0 06 30 04 A0 02 30 00",
+         {"Sequence Tag=30", "  LENGTH=8 octet(s)", "Gap Criteria Tag=a0", "  LENGTH=6 octet(s)",
+          "Choice=Compound Gap Criteria Tag", "  LENGTH=4 octet(s)", "Basic Gap Criteria Tag=a0",
+          "  LENGTH=2 octet(s)", "Choice="},
+         DPX_ERR_LEFTOVER},
         {"Specialized Resource Report, unknown identifier", 49, "9F 34 00", {}, DPX_ERR_LEFTOVER},
         {"Apply Charging Report without its wrapper", 36, "30 02 A0 00", {}, DPX_ERR_MANDATORY_MISSING | DPX_ERR_LEFTOVER},
     };
