@@ -34,14 +34,15 @@ constexpr Member kApplyChargingArg[] = {
 
 // ---- Apply Charging Report (36): an OCTET STRING holding the call result -----------------------
 
-// In order; the party to charge and the extensions stand under tag
-// overrides and are read whatever their identifier.
+// In order.  The party to charge and the extensions stand under tag
+// overrides; their identifiers are compared by class and number (either form),
+// so that an element that is not there is not read in place of another.
 constexpr Member kTimeDurationChargingResult[] = {
-    receivingSideId(kAnyTag),
+    receivingSideId(anyForm(0xA0)),
     el(0xA1, "Time Information", 1410, 1411, table(kTimeInformationTable)),
     el(0x82, "Call Active", 1421, 1422, octet(1423)),
     el(0x83, "Call Released At Tcp Expiry", 1425, 1426, none()),
-    extensions(kAnyTag),
+    extensions(anyForm(0x84)),
     el(0xA5, "ACh Charging Address", 4196, 4197, CAMEL_UNIT(decodeAChChargingAddress)),
 };
 constexpr MemberTable kTimeDurationChargingResultMembers =
@@ -60,7 +61,7 @@ constexpr Member kCallGap[] = {
     el(0xA1, "Gap Indicators", 1456, 1457, table(kGapIndicatorsTable)),
     el(0x82, "Control Type", 1467, 1468, octet(1469)),
     el(0xA3, "Gap Treatment", 1470, 1471, table(kGapTreatmentTable)),
-    extensions(0xA4),
+    extensions(anyForm(0x84)),
 };
 constexpr MemberTable kCallGapLoop = members(Walk::Loop, kCallGap);
 constexpr Member kCallGapArg[] = {sequence("Call Gap", 1084, 1085, kCallGapLoop)};

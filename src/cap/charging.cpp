@@ -43,15 +43,15 @@ constexpr MemberTable kAudibleIndicatorChoice = members(Walk::Choice, kAudibleIn
 
 // ---- Time duration charging -------------------------------------------------------------
 
-// The tariff switch interval and the extensions stand under tag overrides:
-// their identifier octets are not compared, so whatever element comes in
-// their place is read as them.
+// The tariff switch interval and the extensions stand under tag overrides;
+// their identifiers are compared by class and number (either form), so
+// that an element that is not there is not read in place of another.
 constexpr Member kTimeDurationCharging[] = {
     el(0x80, "Max Call Period Duration", 1387, 1388, integer(1389, 3)),
     el(0x81, "Release IF Duration Exceeded", 1390, 1391, octet(1392)),
-    tariffSwitchInterval(kAnyTag),
+    tariffSwitchInterval(anyForm(0x82)),
     el(0xA3, "Audible Indicator", 4232, 4233, table(kAudibleIndicatorChoice)),
-    el(kAnyTag, "Extensions", 1481, 0, CAMEL_UNIT(decodeExtensions)),
+    el(anyForm(0x84), "Extensions", 1481, 0, CAMEL_UNIT(decodeExtensions)),
 };
 constexpr MemberTable kTimeDurationChargingMembers = members(Walk::Loop, kTimeDurationCharging);
 

@@ -7,6 +7,8 @@ bool memberTagNext(DecodeState *st, const Member &m) {
     switch (m.tagBits) {
     case 0:
         return room(st, 8);
+    case 1:
+        return tagTestClassNumber(st, m.tag);
     case 16:
         return tagTest16(st, m.tag);
     default:

@@ -64,10 +64,14 @@ struct Value {
 
 // The identifier "read without a value check" under a tag override.
 inline constexpr uint32_t kAnyTag = 0x10000;
+// A one-octet identifier compared by class and number only, so that [n]
+// matches in either form (an element under a tag override whose primitive
+// and constructed encodings are both met).
+constexpr uint32_t anyForm(uint32_t tag) { return 0x20000u | tag; }
 
 struct Member {
     uint32_t tag = 0;            // one octet, or two as read (first octet low: BF 32 -> 0x32BF)
-    uint8_t tagBits = 8;         // 8 or 16; 0 for kAnyTag
+    uint8_t tagBits = 8;         // 8 or 16; 0 for kAnyTag; 1 for anyForm (class and number)
     const char *name = "";       // element name
     FieldIndex tagField = kNoField;
     FieldIndex lengthField = kNoField;
@@ -112,6 +116,9 @@ consteval Member el(uint32_t tag, const char *name, uint32_t tagId, uint32_t len
     if (tag == kAnyTag) {
         m.tag = kAnyTag;
         m.tagBits = 0;
+    } else if ((tag & 0x20000u) != 0) {
+        m.tag = ((tag >> 6) & 3u) * 32 + (tag & 0x1Fu);
+        m.tagBits = 1;
     } else if (tag > 0xFF) {
         m.tag = ((tag & 0xFFu) << 8) | (tag >> 8);
         m.tagBits = 16;
