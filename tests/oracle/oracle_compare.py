@@ -423,6 +423,16 @@ def component_expectations(cp, ora_comps, e, notes):
         e['components'].append(c)
 
 
+def tcap_rules(data, root, ora):
+    """The TCAP-level rules that apply to a message (names of RULE_TEXT)."""
+    notes = set()
+    try:
+        expect(data, root, ora, notes)
+    except Disagreement:
+        pass
+    return notes
+
+
 # --------------------------------------------------------------------------
 # Comparison
 # --------------------------------------------------------------------------
@@ -589,6 +599,8 @@ def main(argv=None):
                     help='messages per message type and length form (default 1000)')
     ap.add_argument('--mutations', type=int, default=2000,
                     help='malformed messages decoded with all passes (default 2000)')
+    ap.add_argument('--per-op', type=int, default=240,
+                    help='call-control messages per operation (default 240)')
     ap.add_argument('--seed', type=int, default=29078)
     ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
     ap.add_argument('--keep', help='keep the generated and decoded files in this folder')
@@ -607,26 +619,39 @@ def main(argv=None):
     sys.path.insert(0, str(tools))
     sys.dont_write_bytecode = True     # leave the shared tools folder as it is
     import capgen  # noqa: E402 (found only at run time)
+    sys.path.insert(0, str(here))
+    import call_control  # noqa: E402
 
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
     mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
+    cc_corpus = call_control.build_corpus(args.per_op, args.seed)
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)
     try:
         src, msrc = work / 'corpus.txt', work / 'mutated.txt'
+        ccsrc = work / 'call_control.txt'
         write_hex(src, corpus)
         write_hex(msrc, mutated)
+        write_hex(ccsrc, cc_corpus)
         ora_out, our_out, mut_out = work / 'oracle.jsonl', work / 'ours.jsonl', work / 'mutated.jsonl'
+        cc_ora, cc_pdml, cc_ours = (work / 'cc_oracle.jsonl', work / 'cc_oracle.pdml',
+                                    work / 'cc_ours.jsonl')
         jobs = {
             'oracle.py': [sys.executable, str(tools / 'oracle.py'), str(src), '--jsonl', '-q',
                           '--no-hex', '--tshark', args.tshark, '-o', str(ora_out)],
             'dpx-decode (corpus)': [args.decoder, '--format', 'json', '--pass', 'md', str(src)],
             'dpx-decode (mutated)': [args.decoder, '--format', 'json',
                                      '--pass', 'md,display,view,keys', str(msrc)],
+            'oracle.py (call control)': [sys.executable, str(tools / 'oracle.py'), str(ccsrc),
+                                         '--jsonl', '-q', '--no-hex', '--tshark', args.tshark,
+                                         '-o', str(cc_ora), '--pdml', str(cc_pdml)],
+            'dpx-decode (call control)': [args.decoder, '--format', 'json',
+                                          '--pass', 'md,display,view,keys', str(ccsrc)],
         }
-        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out}
+        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out,
+                'dpx-decode (call control)': cc_ours}
         procs = {}
         for name, cmd in jobs.items():
             stdout = open(outs[name], 'w') if name in outs else subprocess.DEVNULL
@@ -653,12 +678,21 @@ def main(argv=None):
         for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
             compare(i, group, hexmsg, o, u.get('md') or {}, stats)
         check_mutated(mutated, mut, stats)
+        cc_stats = call_control.check(cc_corpus, call_control.read_pdml(cc_pdml),
+                                      read_jsonl(cc_ora), read_jsonl(cc_ours), parse_node,
+                                      tcap_rules)
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
 
     report(stats, len(corpus), len(mutated), time.time() - started, args.show)
-    return 1 if stats.failures else 0
+    lines, cc_bad = call_control.report(cc_stats, args.show)
+    print('%d call-control messages (%d operations) compared with tshark and decoded with '
+          'all passes' % (len(cc_corpus), len(call_control.OPERATIONS)))
+    print('\n'.join(lines))
+    print('PASSED (call control)' if not cc_bad else
+          'FAILED (call control): %d disagreements' % cc_bad)
+    return 1 if stats.failures or cc_bad else 0
 
 
 def report(stats, n, n_mut, seconds, show):
