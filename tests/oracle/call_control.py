@@ -169,6 +169,37 @@ def cs_id(rng):
     return rng.randint(1, 127)
 
 
+def service_interaction(rng):
+    """ServiceInteractionIndicatorsTwo SEQUENCE contents."""
+    c = _c()
+    b = b''
+    if maybe(rng, .4):
+        b += c.ctxc(0, c.ctx(1, bytes([rng.randint(1, 2)])) +
+                    (c.ctx(2, bytes([rng.randint(1, 2)])) if maybe(rng, .5) else b'') +
+                    (c.ctx(4, bytes([rng.randint(1, 2)])) if maybe(rng, .5) else b''))
+    if maybe(rng, .3):
+        b += c.ctxc(1, c.ctx(1, bytes([rng.randint(1, 2)])) +
+                    (c.ctx(2, bytes([rng.randint(1, 2)])) if maybe(rng, .5) else b''))
+    if maybe(rng, .4):
+        b += c.cint(2, rng.randint(0, 1))
+    if maybe(rng, .3):
+        b += c.cint(4, rng.randint(0, 3))
+    if maybe(rng, .2):
+        b += c.cnull(13)
+    for tag in (50, 51, 52):
+        if maybe(rng, .3):
+            b += c.ctx(tag, bytes([rng.randint(1, 2)]))
+    return b
+
+
+def carrier(rng):
+    return bytes([rng.randint(0, 4)]) + bytes(rng.randrange(256) for _ in range(3))
+
+
+def cug_interlock(rng):
+    return bytes(rng.randrange(256) for _ in range(4))
+
+
 EVENT_TYPES = (2, 3, 4, 5, 6, 7, 9, 10, 12, 13, 14, 15, 17, 18)
 
 
@@ -182,12 +213,18 @@ def arg_initial_dp(rng):
         b += c.ctx(3, isup_calling_like(rng))
     if maybe(rng, .7):
         b += c.ctx(5, bytes([rng.choice([10, 11, 15, rng.randint(0, 255)])]))
+    if maybe(rng, .2):
+        b += c.cint(7, rng.randint(0, 7))
+    if maybe(rng, .2):
+        b += c.ctx(8, bytes([rng.randrange(256)]))
     if maybe(rng, .4):
         b += c.ctx(10, isup_calling_like(rng))
     if maybe(rng, .4):
         b += c.ctx(12, isup_original(rng))
     if maybe(rng, .2):
         b += c.ctxc(15, extensions(rng))
+    if maybe(rng, .2):
+        b += c.ctx(23, bytes([0x91, rng.choice([0x81, 0x84, 0xA1])]))
     if maybe(rng, .3):
         b += c.ctx(25, generic_number(rng, 6))
     if maybe(rng, .5):
@@ -200,8 +237,21 @@ def arg_initial_dp(rng):
         b += c.ctx(30, redirection_info(rng))
     if maybe(rng, .3):
         b += c.ctx(17, cause(rng))
+    if maybe(rng, .2):
+        b += c.ctxc(32, service_interaction(rng))
+    if maybe(rng, .2):
+        b += c.ctx(37, carrier(rng))
+    if maybe(rng, .2):
+        b += c.ctx(45, c.int_content(rng.randint(0, 32767)))
+    if maybe(rng, .2):
+        b += c.ctx(46, cug_interlock(rng))
+    if maybe(rng, .1):
+        b += c.cnull(47)
     if maybe(rng, .8):
         b += c.ctx(50, imsi(rng))
+    if maybe(rng, .3):
+        b += c.ctxc(51, rng.choice([c.cnull(0), c.cnull(1), c.cnull(2),
+                                    c.enumerated(rng.randint(0, 3))]))
     if maybe(rng, .7):
         b += c.ctxc(52, location_information(rng))
     if maybe(rng, .5):
@@ -264,6 +314,12 @@ def arg_establish_temporary_connection(rng):
         b += c.ctx(3, bytes(rng.randrange(256) for _ in range(rng.randint(1, 4))))
     if maybe(rng, .2):
         b += c.ctxc(4, extensions(rng))
+    if maybe(rng, .2):
+        b += c.ctx(5, carrier(rng))
+    if maybe(rng, .2):
+        b += c.ctxc(6, service_interaction(rng))
+    if maybe(rng, .2):
+        b += c.ctx(50, bytes([rng.randrange(256)]))
     if maybe(rng, .4):
         b += c.ctx(51, isup_calling_like(rng))
     return c.seq(b)
@@ -274,6 +330,8 @@ def arg_connect_to_resource(rng):
     b = c.ctx(0, isup_called(rng)) if maybe(rng, .6) else c.cnull(3)
     if maybe(rng, .2):
         b += c.ctxc(4, extensions(rng))
+    if maybe(rng, .2):
+        b += c.ctxc(7, service_interaction(rng))
     if maybe(rng, .3):
         b += c.ctx(50, bytes([cs_id(rng)]))
     return c.seq(b)
@@ -282,10 +340,14 @@ def arg_connect_to_resource(rng):
 def arg_connect(rng):
     c = _c()
     b = c.ctxc(0, *[c.octets(isup_called(rng)) for _ in range(rng.randint(1, 3))])
+    if maybe(rng, .2):
+        b += c.ctx(1, bytes([0, 0, rng.choice([0, 1, 2, 4, 5, 6, 7, 8, rng.randrange(256)])]))
     if maybe(rng, .4):
         b += c.ctx(6, isup_original(rng))
     if maybe(rng, .2):
         b += c.ctxc(10, extensions(rng))
+    if maybe(rng, .2):
+        b += c.ctx(11, carrier(rng))
     if maybe(rng, .4):
         b += c.ctx(28, bytes([rng.choice([10, 11, rng.randint(0, 255)])]))
     if maybe(rng, .3):
@@ -294,12 +356,22 @@ def arg_connect(rng):
         b += c.ctx(30, redirection_info(rng))
     if maybe(rng, .3):
         b += c.ctxc(14, *[c.octets(generic_number(rng)) for _ in range(rng.randint(1, 2))])
+    if maybe(rng, .2):
+        b += c.ctxc(15, service_interaction(rng))
     if maybe(rng, .4):
         b += c.ctx(19, isup_calling_like(rng))
+    if maybe(rng, .2):
+        b += c.ctx(31, cug_interlock(rng))
+    if maybe(rng, .1):
+        b += c.cnull(32)
     if maybe(rng, .2):
         b += c.cnull(55)
     if maybe(rng, .2):
         b += c.cnull(56)
+    if maybe(rng, .2):
+        b += c.ctx(57, bytes([rng.randrange(256)]))
+    if maybe(rng, .1):
+        b += c.cnull(58)
     return c.seq(b)
 
 
@@ -338,6 +410,10 @@ def arg_event_report_bcsm(rng):
     if et in ESI and maybe(rng, .8):
         tag, has_cause = ESI[et]
         inner = c.ctx(0, cause(rng)) if has_cause and maybe(rng, .8) else b''
+        if et in (7, 15) and maybe(rng, .5):
+            inner = c.ctx(50, isup_called(rng))          # destinationAddress
+        if et in (13, 14) and maybe(rng, .3):
+            inner += c.cnull(50)                           # callForwarded
         b += c.ctxc(2, c.ctxc(tag, inner))
     if maybe(rng, .7):
         b += c.ctxc(3, leg(rng, 1))
@@ -418,15 +494,37 @@ def arg_continue_with_argument(rng):
     c = _c()
     b = b''
     if maybe(rng, .2):
+        b += c.ctx(1, bytes([0, 0, rng.choice([0, 1, 2, 4, 5, 6, 7, 8])]))
+    if maybe(rng, .2):
         b += c.ctxc(6, extensions(rng))
+    if maybe(rng, .2):
+        b += c.ctxc(7, service_interaction(rng))
     if maybe(rng, .5):
         b += c.ctx(12, bytes([rng.choice([10, 11, rng.randint(0, 255)])]))
     if maybe(rng, .3):
         b += c.ctxc(16, *[c.octets(generic_number(rng)) for _ in range(rng.randint(1, 2))])
+    if maybe(rng, .2):
+        b += c.ctx(17, cug_interlock(rng))
+    if maybe(rng, .1):
+        b += c.cnull(18)
     if maybe(rng, .4):
         b += c.ctx(50, isup_calling_like(rng))
+    if maybe(rng, .2):
+        b += c.ctx(52, carrier(rng))
     if maybe(rng, .3):
         b += c.cnull(55)
+    if maybe(rng, .2):
+        b += c.ctx(56, bytes([rng.randrange(256)]))
+    if maybe(rng, .1):
+        b += c.cnull(57)
+    if maybe(rng, .1):
+        b += c.cnull(58)
+    if maybe(rng, .3):
+        x = b''.join(c.cnull(t) for t in (0, 1, 2) if maybe(rng, .4))
+        if maybe(rng, .6):
+            x += c.ctxc(3, c.ctx(0, bytes([cs_id(rng)])) if maybe(rng, .5)
+                        else c.ctxc(1, leg(rng)))
+        b += c.ctxc(59, x)
     return c.seq(b)
 
 
@@ -583,8 +681,18 @@ def t_int(show, raw, off, size, data):
     return int(show, 0), None
 
 
+def t_int8(show, raw, off, size, data):            # tshark shows it signed
+    return int(show) % 256, None
+
+
 def t_hexint(show, raw, off, size, data):          # "02" (leg ids are hex)
     return int(show, 16), None
+
+
+def t_octet(show, raw, off, size, data):
+    """The octet itself: tshark shows some one-octet values through a
+    mis-sized integer (category 0x0b as 4294967290 in some arguments)."""
+    return data[off], (None if show == str(data[off]) else 'tshark-shows-octet-garbled')
 
 
 def t_digits(show, raw, off, size, data):
@@ -710,7 +818,9 @@ CHARGE = ('camel.chargeNumber',)
 GENERIC = ('camel.GenericNumber', 'camel.assistingSSPIPRoutingAddress', 'camel.correlationID')
 ISDN = ('gsm_map.ms.vlr_number', 'gsm_map.ms.msc_Number', 'camel.mscAddress',
         'camel.gsmSCFAddress')
-ISDN_DIGITS = ('e164.msisdn', 'gsm_map.address.digits')
+# tshark shows the digits by numbering plan: E.164, land mobile (as an IMSI)
+# or other
+ISDN_DIGITS = ('e164.msisdn', 'e212.imsi', 'gsm_map.address.digits')
 NAI = 'isup.calling_party_nature_of_address_indicator'
 NPI = 'isup.numbering_plan_indicator'
 APRI = 'isup.address_presentation_restricted_indicator'
@@ -781,7 +891,8 @@ VALUES = (
      o_digits),
     ('charge number nature of address', CHARGE, (NAI,), (1942,), t_int, o_num),
     ('charge number numbering plan', CHARGE, (NPI,), (1944,), t_int, o_num),
-    ('calling party\'s category', None, ('camel.callingPartysCategory',), (1634,), t_int, o_num),
+    ('calling party\'s category', None, ('camel.callingPartysCategory',), (1634,), t_octet,
+     o_num),
     ('cause value', None, ('camel.cause_indicator',), (1480,), t_int, o_num),
     ('cause location', None, ('q931.cause_location',), (1476,), t_int, o_num),
     ('cause / bearer coding standard', None, ('q931.coding_standard',), (1477, 1705), t_int,
@@ -791,7 +902,7 @@ VALUES = (
     ('bearer transfer rate', None, ('q931.information_transfer_rate',), (1707,), t_int, o_num),
     ('bearer transfer mode', None, ('q931.transfer_mode',), (1708,), t_int, o_num),
     ('bearer layer 1 protocol', None, ('q931.uil1',), (1725,), t_int, o_num),
-    ('IMSI digits', None, ('e212.imsi',), (2025, 2029), t_digits, o_digits),
+    ('IMSI digits', ('camel.iMSI',), ('e212.imsi',), (2025, 2029), t_digits, o_digits),
     ('ISDN address digits (VLR, MSC, gsmSCF)', ISDN, ISDN_DIGITS, (2058,), t_filler_f, o_digits),
     ('ISDN address nature of address', ISDN, ('gsm_map.nature_of_number',), (2055,), t_int,
      o_num),
@@ -828,6 +939,7 @@ VALUES = (
     ('leg id: side value', None, ('inap.sendingSideID', 'inap.receivingSideID',
                                   'camel.sendingSideID', 'camel.receivingSideID'),
      (1554,), t_hexint, o_num),
+    ('cancel: invoke id', None, ('camel.invokeID',), (1531,), t_int8, o_num),
     ('timer id', None, ('camel.timerID',), (2306,), t_int, o_num),
     ('timer value', None, ('camel.timervalue',), (1376,), t_int, o_num),
     ('requested info type (report)', None, ('camel.requestedInformationType',), (1504,), t_int,
@@ -883,6 +995,8 @@ RULE_TEXT = {
                           '(naCarrierInformation [0] first there): compared by their octets; '
                           'the GMSC address (80), forwarding number (81), bearer capability '
                           '(A6) and basic service code (A7) are not compared',
+    'tshark-shows-octet-garbled': 'not our rule: tshark shows the calling party\'s category '
+                                  'through a mis-sized integer; the octet is compared',
     'opcode-56-not-decoded-by-tshark': 'operation 56 (Continue With Argument, old code): '
                                        'tshark does not decode its argument',
     'components-not-reached': 'TCAP-level rule (indefinite message or dialogue portion): the '
