@@ -26,8 +26,7 @@ import random
 import xml.etree.ElementTree as ET
 
 # --------------------------------------------------------------------------
-# Operations of the call-control issue: (opcode, capgen operation name used
-# for the ACN, argument builder below).  56 and 88 share one layout.
+# Random arguments of the call-control operations (OPERATIONS below).
 # --------------------------------------------------------------------------
 
 
@@ -41,23 +40,41 @@ def digits(rng, lo, hi):
     return _c()._digits(rng, lo, hi)
 
 
-def maybe(rng, p):
-    return rng.random() < p
+def octets(rng, lo, hi):
+    return bytes(rng.randrange(256) for _ in range(rng.randint(lo, hi)))
 
 
-def isup_called(rng, nd=None):
+def one(*values):
+    """Content of one octet chosen from values (a range: every value in it)."""
+    pool = [v for x in values for v in (x if isinstance(x, range) else (x,))]
+    return lambda rng: bytes([rng.choice(pool)])
+
+
+def integer(lo, hi):
+    return lambda rng: _c().int_content(rng.randint(lo, hi))
+
+
+def null(rng):
+    return b''
+
+
+def nai(rng):
+    return rng.choice([1, 2, 3, 4, rng.randint(0, 127)])
+
+
+def isup_called(rng):
     """ISUP Called Party Number: random NAI, INN, numbering plan, digits."""
     c = _c()
-    d = digits(rng, 1, 16) if nd is None else digits(rng, nd[0], nd[1])
-    return bytes([c._oe(d) | rng.choice([1, 2, 3, 4, rng.randint(0, 127)]),
-                  (rng.randint(0, 1) << 7) | (rng.randint(0, 7) << 4)]) + c.bcd_isup(d)
+    d = digits(rng, 1, 16)
+    return bytes([c._oe(d) | nai(rng), (rng.randint(0, 1) << 7) | (rng.randint(0, 7) << 4)]) \
+        + c.bcd_isup(d)
 
 
-def isup_calling_like(rng, lo=1, hi=16):
+def isup_calling(rng):
     """Calling Party Number / Location Number / Charge Number layout."""
     c = _c()
-    d = digits(rng, lo, hi)
-    return bytes([c._oe(d) | rng.choice([1, 2, 3, 4, rng.randint(0, 127)]),
+    d = digits(rng, 2, 16)
+    return bytes([c._oe(d) | nai(rng),
                   (rng.randint(0, 1) << 7) | (rng.randint(0, 7) << 4)
                   | (rng.choice([0, 0, 1, 3]) << 2) | rng.randint(0, 3)]) + c.bcd_isup(d)
 
@@ -66,32 +83,26 @@ def isup_original(rng):
     """Original Called / Redirecting number layout (no screening)."""
     c = _c()
     d = digits(rng, 1, 16)
-    return bytes([c._oe(d) | rng.choice([1, 2, 3, 4, rng.randint(0, 127)]),
+    return bytes([c._oe(d) | nai(rng),
                   (rng.randint(0, 7) << 4) | (rng.choice([0, 0, 1, 3]) << 2)]) + c.bcd_isup(d)
 
 
-def generic_number(rng, nqi=None):
-    c = _c()
-    q = rng.randint(0, 10) if nqi is None else nqi
-    return bytes([q]) + isup_calling_like(rng, 1, 16)
+def generic_number(rng, qualifier=None):
+    q = rng.randint(0, 10) if qualifier is None else qualifier
+    return bytes([q]) + isup_calling(rng)
 
 
-def cause(rng, diag=True):
+def cause(rng):
     # coding standard mostly ITU-T: tshark shows location and value only then
-    b = bytes([0x80 | (rng.choice([0, 0, 0, rng.randint(1, 3)]) << 5) | rng.choice([0, 1, 2, 3, 4, 5, 7, 10]),
-               0x80 | rng.randint(1, 127)])
-    if diag and maybe(rng, .2):
-        b += bytes(rng.randrange(256) for _ in range(rng.randint(1, 3)))
-    return b
+    b = bytes([0x80 | (rng.choice([0, 0, 0, rng.randint(1, 3)]) << 5)
+               | rng.choice([0, 1, 2, 3, 4, 5, 7, 10]), 0x80 | rng.randint(1, 127)])
+    return b + (octets(rng, 1, 3) if rng.random() < .2 else b'')
 
 
 def bearer_cap(rng):
     """Q.931 bearer capability: transfer capability and rate, maybe layer 1."""
-    b = bytes([0x80 | rng.choice([0, 8, 9, 16, 17, 24]),
-               0x80 | rng.choice([17, 19, 21, 23])])
-    if maybe(rng, .5):
-        b += bytes([0xA0 | rng.choice([2, 3, 5])])
-    return b
+    b = bytes([0x80 | rng.choice([0, 8, 9, 16, 17, 24]), 0x80 | rng.choice([17, 19, 21, 23])])
+    return b + (bytes([0xA0 | rng.choice([2, 3, 5])]) if rng.random() < .5 else b'')
 
 
 def redirection_info(rng):
@@ -99,507 +110,272 @@ def redirection_info(rng):
                   (rng.randint(0, 6) << 4) | rng.randint(1, 5)])
 
 
-def address_string(rng, lo=4, hi=15):
-    c = _c()
+def address_string(rng, lo=6, hi=15):
     return bytes([0x80 | (rng.randint(0, 7) << 4) | rng.choice([1, 1, 0, 3, 4, 6, 8, 9])]) \
-        + c.tbcd(digits(rng, lo, hi))
+        + _c().tbcd(digits(rng, lo, hi))
+
+
+def bcd_number(rng):
+    return address_string(rng, 1, 24)
 
 
 def imsi(rng):
-    c = _c()
     mcc, mnc = rng.choice([('262', '01'), ('234', '15'), ('310', '410'), ('208', '10')])
-    n = rng.choice([14, 15, 15])
-    return c.tbcd(mcc + mnc + digits(rng, n - 5 - len(mnc) + 2, n - 5 - len(mnc) + 2))
+    n = rng.choice([14, 15, 15]) - len(mcc) - len(mnc)
+    return _c().tbcd(mcc + mnc + digits(rng, n, n))
 
 
 def plmn_lac(rng):
     mcc = '%d%d%d' % (rng.randint(2, 7), rng.randint(0, 9), rng.randint(0, 9))
-    mnc = '%02d' % rng.randint(0, 99) if maybe(rng, .6) else '%03d' % rng.randint(0, 999)
+    mnc = '%02d' % rng.randint(0, 99) if rng.random() < .6 else '%03d' % rng.randint(0, 999)
     return _c().plmn(mcc, mnc) + rng.randint(0, 65535).to_bytes(2, 'big')
 
 
-def location_information(rng):
-    c = _c()
-    b = b''
-    if maybe(rng, .6):
-        b += c.integer(rng.randint(0, 32767))
-    if maybe(rng, .6):
-        b += c.ctx(1, address_string(rng, 6, 15))
-    if maybe(rng, .2):
-        b += c.ctx(2, isup_calling_like(rng, 2, 16))
-    r = rng.random()
-    if r < .45:
-        b += c.ctxc(3, c.ctx(0, plmn_lac(rng) + rng.randint(0, 65535).to_bytes(2, 'big')))
-    elif r < .8:
-        b += c.ctxc(3, c.ctx(1, plmn_lac(rng)))
-    if maybe(rng, .3):
-        b += c.ctx(6, address_string(rng, 6, 15))
-    return b
+def cell_id(rng):
+    return plmn_lac(rng) + rng.randint(0, 65535).to_bytes(2, 'big')
 
 
 def time_and_timezone(rng):
-    c = _c()
-    return c.time_and_timezone(rng.randint(2000, 2030), rng.randint(1, 12), rng.randint(1, 28),
-                               rng.randint(0, 23), rng.randint(0, 59), rng.randint(0, 59),
-                               rng.randint(-47, 56))
+    return _c().time_and_timezone(rng.randint(2000, 2030), rng.randint(1, 12),
+                                  rng.randint(1, 28), rng.randint(0, 23), rng.randint(0, 59),
+                                  rng.randint(0, 59), rng.randint(-47, 56))
 
 
-def leg(rng, side=None, tag=0):
-    """LegID inside its element: sendingSideID [0] or receivingSideID [1]."""
-    c = _c()
-    s = rng.randint(0, 1) if side is None else side
-    return c.ctx(s, bytes([rng.choice([1, 2, rng.randint(1, 30)])]))
+def date_and_time(rng):
+    return _c().date_and_time(rng.randint(2000, 2030), rng.randint(1, 12), rng.randint(1, 28),
+                              rng.randint(0, 23), rng.randint(0, 59), rng.randint(0, 59))
+
+
+def leg(side):
+    """LegID (a CHOICE): sendingSideID [0] or receivingSideID [1]; side None:
+    either."""
+    def f(rng):
+        s = rng.randint(0, 1) if side is None else side
+        return _c().ctx(s, bytes([rng.choice([1, 2, rng.randint(1, 30)])]))
+    return f
 
 
 def service_key(rng):
-    return rng.choice([rng.randint(0, 255), rng.randint(0, 65535), rng.randint(0, 2 ** 31 - 1)])
+    return _c().int_content(rng.choice([rng.randint(0, 255), rng.randint(0, 65535),
+                                        rng.randint(0, 2 ** 31 - 1)]))
 
 
 def extensions(rng):
     """ExtensionField list: local type, criticality, value [1]."""
     c = _c()
-    n = rng.randint(1, 2)
     return b''.join(c.seq(c.integer(rng.randint(0, 127)), c.tlv(0x0A, bytes([rng.randint(0, 1)])),
-                          c.ctxc(1, c.octets(bytes(rng.randrange(256)
-                                                  for _ in range(rng.randint(1, 4))))))
-                    for _ in range(n))
+                          c.ctxc(1, c.octets(octets(rng, 1, 4))))
+                    for _ in range(rng.randint(1, 2)))
 
 
-def cs_id(rng):
-    return rng.randint(1, 127)
+def some(rows):
+    """Content of a SEQUENCE (or SET): rows of (probability, identifier,
+    content builder), in ASN.1 order; each row present with its probability."""
+    def f(rng):
+        c = _c()
+        return b''.join(c.tlv(bytes.fromhex(tag), build(rng)) for p, tag, build in rows
+                        if rng.random() < p)
+    return f
 
 
-def service_interaction(rng):
-    """ServiceInteractionIndicatorsTwo SEQUENCE contents."""
+def choice(rows):
+    """Content of a CHOICE: one of rows (weight, identifier, content builder)."""
+    def f(rng):
+        _, tag, build = rng.choices(rows, weights=[r[0] for r in rows])[0]
+        return _c().tlv(bytes.fromhex(tag), build(rng))
+    return f
+
+
+def repeat(tag, build, lo, hi):
+    def f(rng):
+        return b''.join(_c().tlv(bytes.fromhex(tag), build(rng))
+                        for _ in range(rng.randint(lo, hi)))
+    return f
+
+
+CS_ID = integer(1, 127)
+SIDE = one(1, 2)
+SERVICE_INTERACTION = some((
+    (.4, 'A0', some(((1, '81', SIDE), (.5, '82', SIDE), (.5, '84', SIDE)))),
+    (.3, 'A1', some(((1, '81', SIDE), (.5, '82', SIDE)))),
+    (.4, '82', one(0, 1)),
+    (.3, '84', one(range(4))),
+    (.2, '8D', null),
+    (.3, '9F32', SIDE), (.3, '9F33', SIDE), (.3, '9F34', SIDE),
+))
+CARRIER = (lambda rng: bytes([rng.randint(0, 4)]) + octets(rng, 3, 3))
+CUG_INTERLOCK = (lambda rng: octets(rng, 4, 4))
+ALERTING = (lambda rng: bytes([0, 0, rng.choice([0, 1, 2, 4, 5, 6, 7, 8, rng.randrange(256)])]))
+CATEGORY = one(10, 11, 15, range(256))
+EVENT_TYPE = one(2, 3, 4, 5, 6, 7, 9, 10, 12, 13, 14, 15, 17, 18)
+CALLED_NUMBERS = repeat('04', isup_called, 1, 3)
+GENERIC_NUMBERS = repeat('04', generic_number, 1, 2)
+LOCATION_INFORMATION = some((
+    (.6, '02', integer(0, 32767)),
+    (.6, '81', address_string),
+    (.2, '82', isup_calling),
+    (.8, 'A3', choice(((9, '80', cell_id), (7, '81', plmn_lac)))),
+    (.3, '86', address_string),
+))
+BASIC_SERVICE = choice(((1, '82', one(0x11, 0x12, 0x21, 0x10)), (1, '83', one(0x11, 0x12, 0x21))))
+BEARER = some(((1, '80', bearer_cap),))
+# The Initial DP argument extension with the member identifiers our decoder
+# reads (tshark's are one higher: it has naCarrierInformation [0] first).
+IDP_EXTENSION = some((
+    (.6, '80', address_string), (.5, '81', isup_called), (.5, '82', lambda rng: b'\x53\x19\x92'),
+    (.5, '83', lambda rng: _c().tbcd(digits(rng, 16, 16))),
+    (.5, '84', lambda rng: bytes([4, rng.choice([0x80, 0xC0, 0xE0, 0xF0])])),
+    (.3, '85', lambda rng: bytes([rng.randint(0, 7)]) + octets(rng, 1, 1)),
+    (.5, 'A6', BEARER), (.4, 'A7', BASIC_SERVICE),
+    (.3, '89', lambda rng: b'\x88\x90'), (.2, '8A', lambda rng: b'\x88\x90\xa2'),
+))
+
+# --- arguments: outer identifier (None: the choice itself) and contents,
+# in the ASN.1 order of each type ------------------------------------------
+INITIAL_DP = some((
+    (1, '80', service_key), (.9, '82', isup_called), (.9, '83', isup_calling),
+    (.7, '85', CATEGORY), (.2, '87', one(range(8))), (.2, '88', one(range(256))),
+    (.4, '8A', isup_calling), (.4, '8C', isup_original), (.2, 'AF', extensions),
+    (.2, '97', lambda rng: bytes([0x91, rng.choice([0x81, 0x84, 0xA1])])),
+    (.3, '99', lambda rng: generic_number(rng, 6)), (.5, 'BB', BEARER),
+    (.8, '9C', EVENT_TYPE), (.3, '9D', isup_original), (.3, '9E', redirection_info),
+    (.3, '91', cause), (.2, 'BF20', SERVICE_INTERACTION), (.2, '9F25', CARRIER),
+    (.2, '9F2D', integer(0, 32767)), (.2, '9F2E', CUG_INTERLOCK), (.1, '9F2F', null),
+    (.8, '9F32', imsi),
+    (.3, 'BF33', choice(((1, '80', null), (1, '81', null), (1, '82', null),
+                         (1, '0A', one(range(4)))))),
+    (.7, 'BF34', LOCATION_INFORMATION), (.5, 'BF35', BASIC_SERVICE),
+    (.5, '9F36', lambda rng: octets(rng, 1, 8)), (.6, '9F37', address_string),
+    (.4, '9F38', bcd_number), (.5, '9F39', time_and_timezone), (.1, '9F3A', null),
+    (.4, 'BF3B', IDP_EXTENSION),
+))
+ASSIST_REQUEST_INSTRUCTIONS = some((
+    (1, '80', generic_number), (1, '82', one(range(256))), (.2, 'A3', extensions)))
+ESTABLISH_TEMPORARY_CONNECTION = some((
+    (1, '80', generic_number), (.6, '81', generic_number),
+    (.3, '83', lambda rng: octets(rng, 1, 4)), (.2, 'A4', extensions), (.2, '85', CARRIER),
+    (.2, 'A6', SERVICE_INTERACTION), (.2, '9F32', one(range(256))), (.4, '9F33', isup_calling),
+))
+RESOURCE_ADDRESS = choice(((6, '80', isup_called), (4, '83', null)))
+CONNECT_TO_RESOURCE = (lambda rng: RESOURCE_ADDRESS(rng) + CONNECT_TO_RESOURCE_REST(rng))
+CONNECT_TO_RESOURCE_REST = some((
+    (.2, 'A4', extensions),
+    (.2, 'A7', SERVICE_INTERACTION), (.3, '9F32', CS_ID),
+))
+CONNECT = some((
+    (1, 'A0', CALLED_NUMBERS), (.2, '81', ALERTING), (.4, '86', isup_original),
+    (.2, 'AA', extensions), (.2, '8B', CARRIER), (.4, '9C', CATEGORY), (.3, '9D', isup_original),
+    (.3, '9E', redirection_info), (.3, 'AE', GENERIC_NUMBERS), (.2, 'AF', SERVICE_INTERACTION),
+    (.4, '93', isup_calling), (.2, '9F1F', CUG_INTERLOCK), (.1, '9F20', null),
+    (.2, '9F37', null), (.2, '9F38', null), (.2, '9F39', one(range(256))), (.1, '9F3A', null),
+))
+BCSM_EVENT = some((
+    (1, '80', EVENT_TYPE), (1, '81', one(0, 1, 2)), (.7, 'A2', leg(0)),
+    (.2, 'BE', some(((1, '81', integer(0, 2047)),))), (.1, '9F32', null),
+))
+REQUEST_REPORT_BCSM_EVENT = some((
+    (1, 'A0', repeat('30', BCSM_EVENT, 1, 4)), (.2, 'A2', extensions)))
+
+
+def event_report_bcsm(rng):
+    """Event type and, for most types, its event-specific information."""
     c = _c()
-    b = b''
-    if maybe(rng, .4):
-        b += c.ctxc(0, c.ctx(1, bytes([rng.randint(1, 2)])) +
-                    (c.ctx(2, bytes([rng.randint(1, 2)])) if maybe(rng, .5) else b'') +
-                    (c.ctx(4, bytes([rng.randint(1, 2)])) if maybe(rng, .5) else b''))
-    if maybe(rng, .3):
-        b += c.ctxc(1, c.ctx(1, bytes([rng.randint(1, 2)])) +
-                    (c.ctx(2, bytes([rng.randint(1, 2)])) if maybe(rng, .5) else b''))
-    if maybe(rng, .4):
-        b += c.cint(2, rng.randint(0, 1))
-    if maybe(rng, .3):
-        b += c.cint(4, rng.randint(0, 3))
-    if maybe(rng, .2):
-        b += c.cnull(13)
-    for tag in (50, 51, 52):
-        if maybe(rng, .3):
-            b += c.ctx(tag, bytes([rng.randint(1, 2)]))
-    return b
-
-
-def carrier(rng):
-    return bytes([rng.randint(0, 4)]) + bytes(rng.randrange(256) for _ in range(3))
-
-
-def cug_interlock(rng):
-    return bytes(rng.randrange(256) for _ in range(4))
-
-
-EVENT_TYPES = (2, 3, 4, 5, 6, 7, 9, 10, 12, 13, 14, 15, 17, 18)
-
-
-# --- arguments, in the ASN.1 order of each type --------------------------
-def arg_initial_dp(rng):
-    c = _c()
-    b = c.cint(0, service_key(rng))
-    if maybe(rng, .9):
-        b += c.ctx(2, isup_called(rng))
-    if maybe(rng, .9):
-        b += c.ctx(3, isup_calling_like(rng))
-    if maybe(rng, .7):
-        b += c.ctx(5, bytes([rng.choice([10, 11, 15, rng.randint(0, 255)])]))
-    if maybe(rng, .2):
-        b += c.cint(7, rng.randint(0, 7))
-    if maybe(rng, .2):
-        b += c.ctx(8, bytes([rng.randrange(256)]))
-    if maybe(rng, .4):
-        b += c.ctx(10, isup_calling_like(rng))
-    if maybe(rng, .4):
-        b += c.ctx(12, isup_original(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(15, extensions(rng))
-    if maybe(rng, .2):
-        b += c.ctx(23, bytes([0x91, rng.choice([0x81, 0x84, 0xA1])]))
-    if maybe(rng, .3):
-        b += c.ctx(25, generic_number(rng, 6))
-    if maybe(rng, .5):
-        b += c.ctxc(27, c.ctx(0, bearer_cap(rng)))
-    if maybe(rng, .8):
-        b += c.cint(28, rng.choice(EVENT_TYPES))
-    if maybe(rng, .3):
-        b += c.ctx(29, isup_original(rng))
-    if maybe(rng, .3):
-        b += c.ctx(30, redirection_info(rng))
-    if maybe(rng, .3):
-        b += c.ctx(17, cause(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(32, service_interaction(rng))
-    if maybe(rng, .2):
-        b += c.ctx(37, carrier(rng))
-    if maybe(rng, .2):
-        b += c.ctx(45, c.int_content(rng.randint(0, 32767)))
-    if maybe(rng, .2):
-        b += c.ctx(46, cug_interlock(rng))
-    if maybe(rng, .1):
-        b += c.cnull(47)
-    if maybe(rng, .8):
-        b += c.ctx(50, imsi(rng))
-    if maybe(rng, .3):
-        b += c.ctxc(51, rng.choice([c.cnull(0), c.cnull(1), c.cnull(2),
-                                    c.enumerated(rng.randint(0, 3))]))
-    if maybe(rng, .7):
-        b += c.ctxc(52, location_information(rng))
-    if maybe(rng, .5):
-        b += c.ctxc(53, c.ctx(rng.choice([2, 3]), bytes([rng.choice([0x11, 0x12, 0x21, 0x10])])))
-    if maybe(rng, .5):
-        b += c.ctx(54, bytes(rng.randrange(256) for _ in range(rng.randint(1, 8))))
-    if maybe(rng, .6):
-        b += c.ctx(55, address_string(rng, 6, 15))
-    if maybe(rng, .4):
-        b += c.ctx(56, address_string(rng, 1, 24))
-    if maybe(rng, .5):
-        b += c.ctx(57, time_and_timezone(rng))
-    if maybe(rng, .1):
-        b += c.cnull(58)
-    if maybe(rng, .4):
-        b += c.ctxc(59, idp_extension(rng))
-    return c.seq(b)
-
-
-def idp_extension(rng):
-    c = _c()
-    b = b''
-    if maybe(rng, .6):
-        b += c.ctx(0, address_string(rng, 6, 15))
-    if maybe(rng, .5):
-        b += c.ctx(1, isup_called(rng))
-    if maybe(rng, .5):
-        b += c.ctx(2, bytes([0x53, 0x19, 0x92]))
-    if maybe(rng, .5):
-        b += c.ctx(3, c.tbcd(digits(rng, 16, 16)))
-    if maybe(rng, .5):
-        b += c.ctx(4, bytes([4, rng.choice([0x80, 0xC0, 0xE0, 0xF0])]))
-    if maybe(rng, .3):
-        b += c.ctx(5, bytes([rng.randint(0, 7), rng.randrange(256)]))
-    if maybe(rng, .5):
-        b += c.ctxc(6, c.ctx(0, bearer_cap(rng)))
-    if maybe(rng, .4):
-        b += c.ctxc(7, c.ctx(rng.choice([2, 3]), bytes([rng.choice([0x11, 0x12, 0x21])])))
-    if maybe(rng, .3):
-        b += c.ctx(9, bytes([0x88, 0x90]))
-    if maybe(rng, .2):
-        b += c.ctx(10, bytes([0x88, 0x90, 0xA2]))
-    return b
-
-
-def arg_assist_request_instructions(rng):
-    c = _c()
-    b = c.ctx(0, generic_number(rng)) + c.ctx(2, bytes([rng.randrange(256)]))
-    if maybe(rng, .2):
-        b += c.ctxc(3, extensions(rng))
-    return c.seq(b)
-
-
-def arg_establish_temporary_connection(rng):
-    c = _c()
-    b = c.ctx(0, generic_number(rng))
-    if maybe(rng, .6):
-        b += c.ctx(1, generic_number(rng))
-    if maybe(rng, .3):
-        b += c.ctx(3, bytes(rng.randrange(256) for _ in range(rng.randint(1, 4))))
-    if maybe(rng, .2):
-        b += c.ctxc(4, extensions(rng))
-    if maybe(rng, .2):
-        b += c.ctx(5, carrier(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(6, service_interaction(rng))
-    if maybe(rng, .2):
-        b += c.ctx(50, bytes([rng.randrange(256)]))
-    if maybe(rng, .4):
-        b += c.ctx(51, isup_calling_like(rng))
-    return c.seq(b)
-
-
-def arg_connect_to_resource(rng):
-    c = _c()
-    b = c.ctx(0, isup_called(rng)) if maybe(rng, .6) else c.cnull(3)
-    if maybe(rng, .2):
-        b += c.ctxc(4, extensions(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(7, service_interaction(rng))
-    if maybe(rng, .3):
-        b += c.ctx(50, bytes([cs_id(rng)]))
-    return c.seq(b)
-
-
-def arg_connect(rng):
-    c = _c()
-    b = c.ctxc(0, *[c.octets(isup_called(rng)) for _ in range(rng.randint(1, 3))])
-    if maybe(rng, .2):
-        b += c.ctx(1, bytes([0, 0, rng.choice([0, 1, 2, 4, 5, 6, 7, 8, rng.randrange(256)])]))
-    if maybe(rng, .4):
-        b += c.ctx(6, isup_original(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(10, extensions(rng))
-    if maybe(rng, .2):
-        b += c.ctx(11, carrier(rng))
-    if maybe(rng, .4):
-        b += c.ctx(28, bytes([rng.choice([10, 11, rng.randint(0, 255)])]))
-    if maybe(rng, .3):
-        b += c.ctx(29, isup_original(rng))
-    if maybe(rng, .3):
-        b += c.ctx(30, redirection_info(rng))
-    if maybe(rng, .3):
-        b += c.ctxc(14, *[c.octets(generic_number(rng)) for _ in range(rng.randint(1, 2))])
-    if maybe(rng, .2):
-        b += c.ctxc(15, service_interaction(rng))
-    if maybe(rng, .4):
-        b += c.ctx(19, isup_calling_like(rng))
-    if maybe(rng, .2):
-        b += c.ctx(31, cug_interlock(rng))
-    if maybe(rng, .1):
-        b += c.cnull(32)
-    if maybe(rng, .2):
-        b += c.cnull(55)
-    if maybe(rng, .2):
-        b += c.cnull(56)
-    if maybe(rng, .2):
-        b += c.ctx(57, bytes([rng.randrange(256)]))
-    if maybe(rng, .1):
-        b += c.cnull(58)
-    return c.seq(b)
-
-
-def arg_release_call(rng):
-    return _c().octets(cause(rng))
-
-
-def arg_request_report_bcsm_event(rng):
-    c = _c()
-    events = []
-    for _ in range(rng.randint(1, 4)):
-        b = c.cint(0, rng.choice(EVENT_TYPES)) + c.cint(1, rng.randint(0, 2))
-        if maybe(rng, .7):
-            b += c.ctxc(2, leg(rng, 0))
-        if maybe(rng, .2):
-            b += c.ctxc(30, c.cint(1, rng.randint(0, 2047)))
-        if maybe(rng, .1):
-            b += c.cnull(50)
-        events.append(c.seq(b))
-    b = c.ctxc(0, *events)
-    if maybe(rng, .2):
-        b += c.ctxc(2, extensions(rng))
-    return c.seq(b)
-
-
-# event type -> tag number of its event-specific information, and whether
-# that alternative carries a cause [0]
-ESI = {4: (2, True), 5: (3, True), 6: (4, False), 7: (5, False), 9: (7, True),
-       13: (8, True), 14: (9, False), 15: (10, False), 17: (12, True)}
-
-
-def arg_event_report_bcsm(rng):
-    c = _c()
-    et = rng.choice(EVENT_TYPES)
+    et = rng.choice((2, 3, 4, 5, 6, 7, 9, 10, 12, 13, 14, 15, 17, 18))
     b = c.cint(0, et)
-    if et in ESI and maybe(rng, .8):
-        tag, has_cause = ESI[et]
-        inner = c.ctx(0, cause(rng)) if has_cause and maybe(rng, .8) else b''
-        if et in (7, 15) and maybe(rng, .5):
-            inner = c.ctx(50, isup_called(rng))          # destinationAddress
-        if et in (13, 14) and maybe(rng, .3):
-            inner += c.cnull(50)                           # callForwarded
-        b += c.ctxc(2, c.ctxc(tag, inner))
-    if maybe(rng, .7):
-        b += c.ctxc(3, leg(rng, 1))
-    if maybe(rng, .7):
-        b += c.ctxc(4, c.cint(0, rng.randint(0, 1)))
-    return c.seq(b)
+    # event type -> identifier of its specific information and its contents
+    specific = {4: ('A2', some(((.8, '80', cause),))), 5: ('A3', some(((.8, '80', cause),))),
+                6: ('A4', null), 7: ('A5', some(((.5, '9F32', isup_called),))),
+                9: ('A7', some(((.8, '80', cause),))),
+                13: ('A8', some(((.8, '80', cause), (.3, '9F32', null)))),
+                14: ('A9', some(((.3, '9F32', null),))),
+                15: ('AA', some(((.5, '9F32', isup_called),))),
+                17: ('AC', some(((.8, '80', cause),)))}
+    if et in specific and rng.random() < .8:
+        tag, build = specific[et]
+        b += c.ctxc(2, c.tlv(bytes.fromhex(tag), build(rng)))
+    return b + some(((.7, 'A3', leg(1)), (.7, 'A4', some(((1, '80', one(0, 1)),)))))(rng)
 
 
-def arg_initiate_call_attempt(rng):
+INITIATE_CALL_ATTEMPT = some((
+    (1, 'A0', CALLED_NUMBERS), (.2, 'A4', extensions), (.5, 'A5', leg(0)), (.4, '86', CS_ID),
+    (.6, '9E', isup_calling), (.4, '9F33', lambda rng: octets(rng, 1, 8)),
+    (.4, '9F34', address_string), (.2, '9F35', null),
+))
+RESET_TIMER = some((
+    (1, '80', one(0)), (1, '81', lambda rng: _c().int_content(
+        rng.choice([rng.randint(0, 255), rng.randint(0, 2 ** 31 - 1)]))),
+    (.2, 'A2', extensions), (.3, '83', CS_ID),
+))
+
+
+def requested_information(rng):
     c = _c()
-    b = c.ctxc(0, c.octets(isup_called(rng)))
-    if maybe(rng, .2):
-        b += c.ctxc(4, extensions(rng))
-    if maybe(rng, .5):
-        b += c.ctxc(5, leg(rng, 0))
-    if maybe(rng, .4):
-        b += c.ctx(6, bytes([cs_id(rng)]))
-    if maybe(rng, .6):
-        b += c.ctx(30, isup_calling_like(rng))
-    if maybe(rng, .4):
-        b += c.ctx(51, bytes(rng.randrange(256) for _ in range(rng.randint(1, 8))))
-    if maybe(rng, .4):
-        b += c.ctx(52, address_string(rng, 6, 15))
-    if maybe(rng, .2):
-        b += c.cnull(53)
-    return c.seq(b)
-
-
-def arg_reset_timer(rng):
-    c = _c()
-    b = c.cint(0, 0) + c.cint(1, rng.choice([rng.randint(0, 255), rng.randint(0, 2 ** 31 - 1)]))
-    if maybe(rng, .2):
-        b += c.ctxc(2, extensions(rng))
-    if maybe(rng, .3):
-        b += c.ctx(3, bytes([cs_id(rng)]))
-    return c.seq(b)
-
-
-def arg_call_information_report(rng):
-    c = _c()
+    values = {0: ('80', integer(0, 255)), 1: ('81', date_and_time),
+              2: ('82', integer(0, 2 ** 31 - 1)), 30: ('9E', cause)}
     items = []
-    for t in rng.sample([0, 1, 2, 30], rng.randint(1, 4)):
-        if t == 0:
-            v = c.cint(0, rng.randint(0, 255))
-        elif t == 1:
-            v = c.ctx(1, c.date_and_time(rng.randint(2000, 2030), rng.randint(1, 12),
-                                         rng.randint(1, 28), rng.randint(0, 23),
-                                         rng.randint(0, 59), rng.randint(0, 59)))
-        elif t == 2:
-            v = c.cint(2, rng.randint(0, 2 ** 31 - 1))
-        else:
-            v = c.ctx(30, cause(rng))
-        items.append(c.seq(c.cint(0, t), c.ctxc(1, v)))
-    b = c.ctxc(0, *items)
-    if maybe(rng, .2):
-        b += c.ctxc(2, extensions(rng))
-    if maybe(rng, .7):
-        b += c.ctxc(3, leg(rng, 1))
-    return c.seq(b)
+    for t in rng.sample(sorted(values), rng.randint(1, 4)):
+        tag, build = values[t]
+        items.append(c.seq(c.cint(0, t), c.ctxc(1, c.tlv(bytes.fromhex(tag), build(rng)))))
+    return b''.join(items)
 
 
-def arg_call_information_request(rng):
-    c = _c()
-    b = c.ctxc(0, *[c.enumerated(t) for t in rng.sample([0, 1, 2, 30], rng.randint(1, 4))])
-    if maybe(rng, .2):
-        b += c.ctxc(2, extensions(rng))
-    if maybe(rng, .7):
-        b += c.ctxc(3, leg(rng, 0))
-    return c.seq(b)
+CALL_INFORMATION_REPORT = some((
+    (1, 'A0', requested_information), (.2, 'A2', extensions), (.7, 'A3', leg(1))))
+CALL_INFORMATION_REQUEST = some((
+    (1, 'A0', lambda rng: b''.join(_c().enumerated(t) for t in rng.sample([0, 1, 2, 30],
+                                                                         rng.randint(1, 4)))),
+    (.2, 'A2', extensions), (.7, 'A3', leg(0)),
+))
+CANCEL = choice(((6, '80', lambda rng: _c().int_content(rng.randint(-128, 127))), (4, '81', null)))
+CONTINUE_WITH_ARGUMENT = some((
+    (.2, '81', ALERTING), (.2, 'A6', extensions), (.2, 'A7', SERVICE_INTERACTION),
+    (.5, '8C', CATEGORY), (.3, 'B0', GENERIC_NUMBERS), (.2, '91', CUG_INTERLOCK),
+    (.1, '92', null), (.4, '9F32', isup_calling), (.2, '9F34', CARRIER), (.3, '9F37', null),
+    (.2, '9F38', one(range(256))), (.1, '9F39', null), (.1, '9F3A', null),
+    (.3, 'BF3B', some(((.4, '80', null), (.4, '81', null), (.4, '82', null),
+                       (.6, 'A3', choice(((1, '80', CS_ID), (1, 'A1', leg(None)))))))),
+))
+DFC_WITH_ARGUMENT = some(((.7, '81', CS_ID), (.3, 'A2', extensions)))
+DISCONNECT_LEG = some(((1, 'A0', leg(None)), (.6, '81', cause), (.2, 'A2', extensions)))
+MOVE_LEG = some(((1, 'A0', leg(None)), (.2, 'A2', extensions)))
+SPLIT_LEG = some(((1, 'A0', leg(None)), (.6, '81', CS_ID), (.2, 'A2', extensions)))
+# callSegmentFailure [0] { callSegmentID [0], cause [2] } or
+# bCSM-Failure [1] { legID [0], cause [2] }
+ENTITY_RELEASED = choice((
+    (1, 'A0', some(((.8, '80', CS_ID), (.8, '82', cause)))),
+    (1, 'A1', some(((.8, 'A0', leg(None)), (.8, '82', cause)))),
+))
 
-
-def arg_cancel(rng):
-    c = _c()
-    return c.cint(0, rng.randint(-128, 127)) if maybe(rng, .6) else c.cnull(1)
-
-
-def arg_continue_with_argument(rng):
-    c = _c()
-    b = b''
-    if maybe(rng, .2):
-        b += c.ctx(1, bytes([0, 0, rng.choice([0, 1, 2, 4, 5, 6, 7, 8])]))
-    if maybe(rng, .2):
-        b += c.ctxc(6, extensions(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(7, service_interaction(rng))
-    if maybe(rng, .5):
-        b += c.ctx(12, bytes([rng.choice([10, 11, rng.randint(0, 255)])]))
-    if maybe(rng, .3):
-        b += c.ctxc(16, *[c.octets(generic_number(rng)) for _ in range(rng.randint(1, 2))])
-    if maybe(rng, .2):
-        b += c.ctx(17, cug_interlock(rng))
-    if maybe(rng, .1):
-        b += c.cnull(18)
-    if maybe(rng, .4):
-        b += c.ctx(50, isup_calling_like(rng))
-    if maybe(rng, .2):
-        b += c.ctx(52, carrier(rng))
-    if maybe(rng, .3):
-        b += c.cnull(55)
-    if maybe(rng, .2):
-        b += c.ctx(56, bytes([rng.randrange(256)]))
-    if maybe(rng, .1):
-        b += c.cnull(57)
-    if maybe(rng, .1):
-        b += c.cnull(58)
-    if maybe(rng, .3):
-        x = b''.join(c.cnull(t) for t in (0, 1, 2) if maybe(rng, .4))
-        if maybe(rng, .6):
-            x += c.ctxc(3, c.ctx(0, bytes([cs_id(rng)])) if maybe(rng, .5)
-                        else c.ctxc(1, leg(rng)))
-        b += c.ctxc(59, x)
-    return c.seq(b)
-
-
-def arg_dfc_with_argument(rng):
-    c = _c()
-    b = c.ctx(1, bytes([cs_id(rng)])) if maybe(rng, .7) else b''
-    if maybe(rng, .3):
-        b += c.ctxc(2, extensions(rng))
-    return c.seq(b)
-
-
-def arg_disconnect_leg(rng):
-    c = _c()
-    b = c.ctxc(0, leg(rng))
-    if maybe(rng, .6):
-        b += c.ctx(1, cause(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(2, extensions(rng))
-    return c.seq(b)
-
-
-def arg_move_leg(rng):
-    c = _c()
-    b = c.ctxc(0, leg(rng))
-    if maybe(rng, .2):
-        b += c.ctxc(2, extensions(rng))
-    return c.seq(b)
-
-
-def arg_split_leg(rng):
-    c = _c()
-    b = c.ctxc(0, leg(rng))
-    if maybe(rng, .6):
-        b += c.ctx(1, bytes([cs_id(rng)]))
-    if maybe(rng, .2):
-        b += c.ctxc(2, extensions(rng))
-    return c.seq(b)
-
-
-def arg_entity_released(rng):
-    c = _c()
-    # callSegmentFailure [0] { callSegmentID [0], cause [2] } or
-    # bCSM-Failure [1] { legID [0], cause [2] }
-    if maybe(rng, .5):
-        b = c.ctx(0, bytes([cs_id(rng)])) if maybe(rng, .8) else b''
-        b += c.ctx(2, cause(rng)) if maybe(rng, .8) else b''
-        return c.ctxc(0, b)
-    b = c.ctxc(0, leg(rng)) if maybe(rng, .8) else b''
-    b += c.ctx(2, cause(rng)) if maybe(rng, .8) else b''
-    return c.ctxc(1, b)
-
-
-# opcode -> (capgen operation giving the application context, builder)
+# opcode -> (capgen operation giving the application context, outer
+# identifier of the argument or None for an untagged choice, contents)
 OPERATIONS = {
-    0: ('initialDP', arg_initial_dp),
-    16: ('assistRequestInstructions', arg_assist_request_instructions),
-    17: ('establishTemporaryConnection', arg_establish_temporary_connection),
-    19: ('connectToResource', arg_connect_to_resource),
-    20: ('connect', arg_connect),
-    22: ('releaseCall', arg_release_call),
-    23: ('requestReportBCSMEvent', arg_request_report_bcsm_event),
-    24: ('eventReportBCSM', arg_event_report_bcsm),
-    32: ('initiateCallAttempt', arg_initiate_call_attempt),
-    33: ('resetTimer', arg_reset_timer),
-    44: ('callInformationReport', arg_call_information_report),
-    45: ('callInformationRequest', arg_call_information_request),
-    53: ('cancel', arg_cancel),
-    56: ('continueWithArgument', arg_continue_with_argument),
-    86: ('dFCWithArgument', arg_dfc_with_argument),
-    88: ('continueWithArgument', arg_continue_with_argument),
-    90: ('disconnectLeg', arg_disconnect_leg),
-    93: ('moveLeg', arg_move_leg),
-    95: ('splitLeg', arg_split_leg),
-    96: ('entityReleased', arg_entity_released),
+    0: ('initialDP', '30', INITIAL_DP),
+    16: ('assistRequestInstructions', '30', ASSIST_REQUEST_INSTRUCTIONS),
+    17: ('establishTemporaryConnection', '30', ESTABLISH_TEMPORARY_CONNECTION),
+    19: ('connectToResource', '30', CONNECT_TO_RESOURCE),
+    20: ('connect', '30', CONNECT),
+    22: ('releaseCall', '04', cause),
+    23: ('requestReportBCSMEvent', '30', REQUEST_REPORT_BCSM_EVENT),
+    24: ('eventReportBCSM', '30', event_report_bcsm),
+    32: ('initiateCallAttempt', '30', INITIATE_CALL_ATTEMPT),
+    33: ('resetTimer', '30', RESET_TIMER),
+    44: ('callInformationReport', '30', CALL_INFORMATION_REPORT),
+    45: ('callInformationRequest', '30', CALL_INFORMATION_REQUEST),
+    53: ('cancel', None, CANCEL),
+    56: ('continueWithArgument', '30', CONTINUE_WITH_ARGUMENT),
+    86: ('dFCWithArgument', '30', DFC_WITH_ARGUMENT),
+    88: ('continueWithArgument', '30', CONTINUE_WITH_ARGUMENT),
+    90: ('disconnectLeg', '30', DISCONNECT_LEG),
+    93: ('moveLeg', '30', MOVE_LEG),
+    95: ('splitLeg', '30', SPLIT_LEG),
+    96: ('entityReleased', None, ENTITY_RELEASED),
 }
+
+
+def argument(code, rng):
+    _, outer, build = OPERATIONS[code]
+    content = build(rng)
+    return content if outer is None else _c().tlv(bytes.fromhex(outer), content)
 
 
 def build_corpus(per_op, seed):
@@ -611,7 +387,7 @@ def build_corpus(per_op, seed):
     c = _c()
     parts = ('ext', 'asn1', 'pdu', 'cp', 'comp')
     out = []
-    for code, (name, builder) in sorted(OPERATIONS.items()):
+    for code, (name, _, _) in sorted(OPERATIONS.items()):
         rng = random.Random(seed * 1000 + code)
         for i in range(per_op):
             definite = i % 2 == 0
@@ -625,7 +401,7 @@ def build_corpus(per_op, seed):
                 indef = set(rng.sample(parts, rng.randint(1, len(parts))))
             msg = rng.choice(('begin', 'continue', 'end', 'unidirectional'))
             dialogue = rng.random() < .6
-            hexmsg = c.wrap_invoke(code, builder(rng), msg=msg, invoke_id=rng.randint(-128, 127),
+            hexmsg = c.wrap_invoke(code, argument(code, rng), msg=msg, invoke_id=rng.randint(-128, 127),
                                    dialogue=dialogue, acn=c.default_acn(name),
                                    indef=indef, otid='%08X' % rng.getrandbits(32),
                                    dtid='%08X' % rng.getrandbits(32))
@@ -670,7 +446,7 @@ def read_pdml(path):
 # --------------------------------------------------------------------------
 # Normalisers.  A tshark-side normaliser turns one shown field into the value
 # our field must report: f(show, raw, off, size, data) -> (value, rule or
-# None); None skips the occurrence.  An our-side extractor turns one of our
+# None).  An our-side extractor turns one of our
 # fields into a comparable value.
 # --------------------------------------------------------------------------
 def nibbles(octets):
@@ -717,10 +493,15 @@ def t_filler_f(show, raw, off, size, data):
 
 
 def t_mnc(show, raw, off, size, data):
-    """MNC shown by us in span order: octet 3 bits 8-5, bits 4-1, then (three
-    digits) octet 2 bits 8-5; tshark shows the digits in their real order."""
-    s = show.lower()
-    return (s[1] + s[0] + s[2:]), ('mnc-high-half-first' if s[1] + s[0] != s[:2] else None)
+    """tshark shows the MNC as a number (01 as 1) from octets 2-3 of the
+    MCC-MNC block; our decoder shows its digits in span order: octet 3 bits
+    8-5, bits 4-1, then (three digits) octet 2 bits 8-5."""
+    o2, o3 = data[off], data[off + 1]
+    real = '%x%x' % (o3 & 15, o3 >> 4) + ('' if o2 >> 4 == 15 else '%x' % (o2 >> 4))
+    if int(show) != int(real):
+        return show, None
+    ours = plmn_at(data, off - 1)[1]
+    return ours, ('mnc-high-half-first' if ours != real else None)
 
 
 def plmn_at(data, p):
@@ -825,72 +606,46 @@ NAI = 'isup.calling_party_nature_of_address_indicator'
 NPI = 'isup.numbering_plan_indicator'
 APRI = 'isup.address_presentation_restricted_indicator'
 
-VALUES = (
+# ISUP-format numbers: our field ids of each attribute (0: not shown).
+NUMBER_ATTRIBUTES = (
+    ('nature of address', (NAI, 'isup.called_party_nature_of_address_indicator')),
+    ('numbering plan', (NPI,)),
+    ('presentation', (APRI,)),
+    ('screening', ('isup.screening_indicator', 'isup.screening_indicator_enhanced')),
+    ('NI', ('isup.ni_indicator',)),
+    ('INN', ('isup.inn_indicator',)),
+    ('qualifier', ('isup.number_qualifier_indicator',)),
+)
+NUMBERS = (
+    # number, containers, tshark's digits, our digit ids, digits normaliser,
+    # our ids in NUMBER_ATTRIBUTES order
+    ('called number', CALLED, 'isup.called', (3589, 3592), t_digits,
+     (1819, 1822, 0, 0, 0, 1823, 0)),
+    ('calling number', CALLING, 'isup.calling', (1628, 1631), t_digits,
+     (1617, 1621, 1620, 1619, 1622, 0, 0)),
+    ('location number', LOCATION, 'isup.location_number', (1663,), t_all_halves,
+     (3557, 3569, 1662, 3560, 0, 3575, 0)),
+    ('location information: location number', MS_LOCATION, 'isup.location_number', (2069,),
+     t_all_halves, (2064, 2066, 2067, 2068, 0, 2065, 0)),
+    ('original called', ORIGINAL, 'isup.original_called_number', (1646,), t_all_halves,
+     (1642, 1644, 1645, 0, 0, 0, 0)),
+    ('redirecting', REDIRECTING, 'isup.redirecting', (1818,), t_all_halves,
+     (1814, 1816, 1817, 0, 0, 0, 0)),
+    ('additional calling', ADDITIONAL, 'isup.generic_number', (1670,), t_all_halves,
+     (1664, 1667, 1669, 1666, 1668, 0, 1659)),
+    ('generic number', GENERIC, 'isup.generic_number', (1663,), t_all_halves,
+     (3554, 3566, 1662, 3563, 3572, 0, 1657)),
+    ('charge number', CHARGE, 'isup.location_number', (3600, 3603), t_digits,
+     (1942, 1944, 0, 0, 0, 0, 0)),
+)
+VALUES = tuple(
+    [(number + ' digits', boxes, (tdigits,), ids, norm, o_digits)
+     for number, boxes, tdigits, ids, norm, _ in NUMBERS] +
+    [('%s %s' % (number, attr), boxes, tnames, (fid,), t_int, o_num)
+     for number, boxes, _, _, _, fids in NUMBERS
+     for (attr, tnames), fid in zip(NUMBER_ATTRIBUTES, fids) if fid]) + (
     ('service key', None, ('camel.serviceKey',), (1611,), t_int, o_num),
     ('event type BCSM', None, ('camel.eventTypeBCSM',), (1557,), t_int, o_num),
-    ('called number digits', CALLED, ('isup.called',), (3589, 3592), t_digits, o_digits),
-    ('called number nature of address', CALLED,
-     ('isup.called_party_nature_of_address_indicator',), (1819,), t_int, o_num),
-    ('called number numbering plan', CALLED, (NPI,), (1822,), t_int, o_num),
-    ('called number INN', CALLED, ('isup.inn_indicator',), (1823,), t_int, o_num),
-    ('calling number digits', CALLING, ('isup.calling',), (1628, 1631), t_digits, o_digits),
-    ('calling number nature of address', CALLING, (NAI,), (1617,), t_int, o_num),
-    ('calling number numbering plan', CALLING, (NPI,), (1621,), t_int, o_num),
-    ('calling number presentation', CALLING, (APRI,), (1620,), t_int, o_num),
-    ('calling number screening', CALLING, ('isup.screening_indicator',), (1619,), t_int, o_num),
-    ('calling number NI', CALLING, ('isup.ni_indicator',), (1622,), t_int, o_num),
-    ('location number digits', LOCATION, ('isup.location_number',), (1663,), t_all_halves,
-     o_digits),
-    ('location number nature of address', LOCATION, (NAI,), (3557,), t_int, o_num),
-    ('location number numbering plan', LOCATION, (NPI,), (3569,), t_int, o_num),
-    ('location number presentation', LOCATION, (APRI,), (1662,), t_int, o_num),
-    ('location number screening', LOCATION, ('isup.screening_indicator',), (3560,), t_int, o_num),
-    ('location number INN', LOCATION, ('isup.inn_indicator',), (3575,), t_int, o_num),
-    ('location information: location number digits', MS_LOCATION, ('isup.location_number',),
-     (2069,), t_all_halves, o_digits),
-    ('location information: location number nature of address', MS_LOCATION, (NAI,), (2064,),
-     t_int, o_num),
-    ('location information: location number numbering plan', MS_LOCATION, (NPI,), (2066,),
-     t_int, o_num),
-    ('location information: location number presentation', MS_LOCATION, (APRI,), (2067,),
-     t_int, o_num),
-    ('location information: location number screening', MS_LOCATION,
-     ('isup.screening_indicator',), (2068,), t_int, o_num),
-    ('location information: location number INN', MS_LOCATION, ('isup.inn_indicator',), (2065,),
-     t_int, o_num),
-    ('original called digits', ORIGINAL, ('isup.original_called_number',), (1646,),
-     t_all_halves, o_digits),
-    ('original called nature of address', ORIGINAL, (NAI,), (1642,), t_int, o_num),
-    ('original called numbering plan', ORIGINAL, (NPI,), (1644,), t_int, o_num),
-    ('original called presentation', ORIGINAL, (APRI,), (1645,), t_int, o_num),
-    ('redirecting digits', REDIRECTING, ('isup.redirecting',), (1818,), t_all_halves, o_digits),
-    ('redirecting nature of address', REDIRECTING, (NAI,), (1814,), t_int, o_num),
-    ('redirecting numbering plan', REDIRECTING, (NPI,), (1816,), t_int, o_num),
-    ('redirecting presentation', REDIRECTING, (APRI,), (1817,), t_int, o_num),
-    ('additional calling digits', ADDITIONAL, ('isup.generic_number',), (1670,), t_all_halves,
-     o_digits),
-    ('additional calling qualifier', ADDITIONAL, ('isup.number_qualifier_indicator',), (1659,),
-     t_int, o_num),
-    ('additional calling nature of address', ADDITIONAL, (NAI,), (1664,), t_int, o_num),
-    ('additional calling numbering plan', ADDITIONAL, (NPI,), (1667,), t_int, o_num),
-    ('additional calling presentation', ADDITIONAL, (APRI,), (1669,), t_int, o_num),
-    ('additional calling screening', ADDITIONAL, ('isup.screening_indicator_enhanced',), (1666,),
-     t_int, o_num),
-    ('additional calling NI', ADDITIONAL, ('isup.ni_indicator',), (1668,), t_int, o_num),
-    ('generic number digits', GENERIC, ('isup.generic_number',), (1663,), t_all_halves,
-     o_digits),
-    ('generic number qualifier', GENERIC, ('isup.number_qualifier_indicator',), (1657,),
-     t_int, o_num),
-    ('generic number nature of address', GENERIC, (NAI,), (3554,), t_int, o_num),
-    ('generic number numbering plan', GENERIC, (NPI,), (3566,), t_int, o_num),
-    ('generic number presentation', GENERIC, (APRI,), (1662,), t_int, o_num),
-    ('generic number screening', GENERIC, ('isup.screening_indicator_enhanced',), (3563,),
-     t_int, o_num),
-    ('generic number NI', GENERIC, ('isup.ni_indicator',), (3572,), t_int, o_num),
-    ('charge number digits', CHARGE, ('isup.location_number',), (3600, 3603), t_digits,
-     o_digits),
-    ('charge number nature of address', CHARGE, (NAI,), (1942,), t_int, o_num),
-    ('charge number numbering plan', CHARGE, (NPI,), (1944,), t_int, o_num),
     ('calling party\'s category', None, ('camel.callingPartysCategory',), (1634,), t_octet,
      o_num),
     ('cause value', None, ('camel.cause_indicator',), (1480,), t_int, o_num),
@@ -1044,12 +799,11 @@ def compare_values(op, hexmsg, tfields, md, arg_range, stats):
             if boxes is not None and not any(a <= off < b for a, b in boxes):
                 continue
             try:
-                got = norm(show, raw, off, size, data)
-            except (ValueError, IndexError):
+                want, rule = norm(show, raw, off, size, data)
+            except (ValueError, IndexError) as exc:
+                stats.failures.append(('tshark value', op, '%s: %s %r not understood (%s)'
+                                       % (name, tname, show, exc), hexmsg))
                 continue
-            if got is None:
-                continue
-            want, rule = got
             if rule:
                 rules.add(rule)
             a, b = off + shift, off + shift + max(size, 1)
