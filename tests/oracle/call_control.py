@@ -219,8 +219,9 @@ LOCATION_INFORMATION = some((
 ))
 BASIC_SERVICE = choice(((1, '82', one(0x11, 0x12, 0x21, 0x10)), (1, '83', one(0x11, 0x12, 0x21))))
 BEARER = some(((1, '80', bearer_cap),))
-# The Initial DP argument extension with the member identifiers our decoder
-# reads (tshark's are one higher: it has naCarrierInformation [0] first).
+# The Initial DP argument extension as CAP v4 has it (its high layer
+# compatibility [8] is left out: an OCTET STRING, primitive 88, where our
+# decoder expects A8).
 IDP_EXTENSION = some((
     (.6, '80', address_string), (.5, '81', isup_called), (.5, '82', lambda rng: b'\x53\x19\x92'),
     (.5, '83', lambda rng: _c().tbcd(digits(rng, 16, 16))),
@@ -402,7 +403,7 @@ def build_corpus(per_op, seed):
             msg = rng.choice(('begin', 'continue', 'end', 'unidirectional'))
             dialogue = rng.random() < .6
             hexmsg = c.wrap_invoke(code, argument(code, rng), msg=msg, invoke_id=rng.randint(-128, 127),
-                                   dialogue=dialogue, acn=c.default_acn(name),
+                                   dialogue=dialogue, acn=c.default_acn(name, 4),
                                    indef=indef, otid='%08X' % rng.getrandbits(32),
                                    dtid='%08X' % rng.getrandbits(32))
             out.append(('%d/%s' % (code, 'definite' if definite else 'indefinite'), hexmsg))
@@ -562,6 +563,18 @@ def t_octets(show, raw, off, size, data):
     return data[off:off + size].hex(), None
 
 
+def t_bit_string(show, raw, off, size, data):
+    """A BIT STRING: tshark's field starts after the unused-bits octet; our
+    field shows every content octet."""
+    return data[off - 1:off + size].hex(), None
+
+
+def t_explicit(show, raw, off, size, data):
+    """An explicitly tagged CHOICE shown by tshark at its inner value; our
+    field shows the whole content: inner identifier, length and value."""
+    return data[off - 2:off + size].hex(), None
+
+
 def t_sending(show, raw, off, size, data):
     return 128, None
 
@@ -588,7 +601,8 @@ def o_digits(f):
 # shift from tshark's field to ours (leg ids: the choice is the identifier
 # two octets before the side value).
 # --------------------------------------------------------------------------
-CALLED = ('camel.calledPartyNumber', 'camel.CalledPartyNumber', 'camel.ipRoutingAddress')
+CALLED = ('camel.calledPartyNumber', 'camel.CalledPartyNumber', 'camel.ipRoutingAddress',
+          'camel.forwardingDestinationNumber', 'camel.destinationAddress')
 CALLING = ('camel.callingPartyNumber',)
 LOCATION = ('camel.locationNumber',)
 MS_LOCATION = ('gsm_map.ms.locationNumber',)
@@ -598,7 +612,7 @@ ADDITIONAL = ('camel.additionalCallingPartyNumber',)
 CHARGE = ('camel.chargeNumber',)
 GENERIC = ('camel.GenericNumber', 'camel.assistingSSPIPRoutingAddress', 'camel.correlationID')
 ISDN = ('gsm_map.ms.vlr_number', 'gsm_map.ms.msc_Number', 'camel.mscAddress',
-        'camel.gsmSCFAddress')
+        'camel.gsmSCFAddress', 'camel.gmscAddress')
 # tshark shows the digits by numbering plan: E.164, land mobile (as an IMSI)
 # or other
 ISDN_DIGITS = ('e164.msisdn', 'e212.imsi', 'gsm_map.address.digits')
@@ -715,22 +729,25 @@ VALUES = tuple(
      o_num),
     ('redirection counter', None, ('isup.redirection_counter',), (1828,), t_int, o_num),
     ('redirecting reason', None, ('isup.redirection_reason',), (1829,), t_int, o_num),
-    ('ext basic service code: bearer', None, ('gsm_map.ext_BearerService',), (2053,), t_int,
-     o_num),
-    ('ext basic service code: teleservice', None, ('gsm_map.ext_Teleservice',), (2057,), t_int,
-     o_num),
+    ('ext basic service code: bearer', ('camel.ext_basicServiceCode',),
+     ('gsm_map.ext_BearerService',), (2053,), t_int, o_num),
+    ('ext basic service code: teleservice', ('camel.ext_basicServiceCode',),
+     ('gsm_map.ext_Teleservice',), (2057,), t_int, o_num),
     ('call reference number', None, ('camel.callReferenceNumber',), (2135, 4177), t_octets,
      o_digits),
-    # Initial DP extension: our member tags are one below tshark's (it reads
-    # naCarrierInformation [0] first), so each octet-string member is
-    # compared by its octets under the name tshark gives that identifier.
-    ('IDP extension: MS classmark 2 (82)', None, ('camel.forwardingDestinationNumber',), (4218,),
-     t_octets, o_digits),
-    ('IDP extension: IMEI (83)', None, ('camel.ms_Classmark2',), (4221,), t_octets, o_digits),
-    ('IDP extension: supported CAMEL phases (84)', None, ('camel.iMEI',), (4192,), t_octets,
+    # Initial DP argument extension (CAP v4 layout: tshark reads it so under a
+    # CAP v4 context or without one)
+    ('IDP extension: MS classmark 2', None, ('camel.ms_Classmark2',), (4218,), t_octets,
      o_digits),
-    ('IDP extension: low layer compatibility (89, 8A)', None,
-     ('camel.highLayerCompatibility2', 'camel.lowLayerCompatibility'), (4228,), t_octets,
+    ('IDP extension: IMEI', None, ('camel.iMEI',), (4221,), t_octets, o_digits),
+    ('IDP extension: supported CAMEL phases', None, ('camel.supportedCamelPhases',), (4192,),
+     t_bit_string, o_digits, -1),
+    ('IDP extension: offered CAMEL4 functionalities', None,
+     ('camel.offeredCamel4Functionalities',), (4195,), t_bit_string, o_digits, -1),
+    ('IDP extension: basic service code', None, ('camel.ext_basicServiceCode2',), (4224,),
+     t_explicit, o_digits, -2),
+    ('IDP extension: low layer compatibility', None,
+     ('camel.lowLayerCompatibility', 'camel.lowLayerCompatibility2'), (4228,), t_octets,
      o_digits),
 )
 
@@ -746,10 +763,6 @@ RULE_TEXT = {
                             'swapped BCD quarters, sign in bit 4)',
     'stop-time-octets': 'call stop time shows its octets as on the wire (tshark: swapped BCD '
                         'date and time)',
-    'idp-extension-tags': 'Initial DP argument extension members sit one tag below tshark\'s '
-                          '(naCarrierInformation [0] first there): compared by their octets; '
-                          'the GMSC address (80), forwarding number (81), bearer capability '
-                          '(A6) and basic service code (A7) are not compared',
     'tshark-shows-octet-garbled': 'not our rule: tshark shows the calling party\'s category '
                                   'through a mis-sized integer; the octet is compared',
     'opcode-56-not-decoded-by-tshark': 'operation 56 (Continue With Argument, old code): '
@@ -907,8 +920,6 @@ def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
         if op == 56:
             stats.rule('opcode-56-not-decoded-by-tshark', hexmsg)
         else:
-            if op == 0 and b'\xbf\x3b' in data[rng[0]:rng[1]]:
-                stats.rule('idp-extension-tags', hexmsg)
             compare_values(op, hexmsg, tfields, out.get('md') or {}, rng, stats)
         check_coverage(op, hexmsg, out, rng, stats, notes)
     return stats
