@@ -558,10 +558,11 @@ def t_time(part):
 
 def t_stop_time(part):
     """Call stop time: tshark shows 'hh:mm:ss;dd/mm/yyyy' from swapped BCD
-    octets; our decoder shows each octet as on the wire (year: 16 bits)."""
+    octets; our decoder shows each octet as on the wire, the year as one
+    16-bit read (octets assembled least significant first)."""
     def f(show, raw, off, size, data):
         b = data[off:off + size]
-        v = int.from_bytes(b[0:2], 'big') if part == 0 else b[part + 1]
+        v = int.from_bytes(b[0:2], 'little') if part == 0 else b[part + 1]
         return v, 'stop-time-octets'
     return f
 
@@ -769,8 +770,9 @@ RULE_TEXT = {
                            '(tshark: 15, ours: 51)',
     'time-zone-bit-layout': 'time zone read as sign in bit 8 and value in bits 7-1 (3GPP: '
                             'swapped BCD quarters, sign in bit 4)',
-    'stop-time-octets': 'call stop time shows its octets as on the wire (tshark: swapped BCD '
-                        'date and time)',
+    'stop-time-octets': 'call stop time shows its octets as on the wire, the year as one '
+                        '16-bit read, low octet first (tshark: swapped BCD date and time)',
+    'invoke-indefinite': 'TCAP: an indefinite Invoke\'s end-of-contents is not read (flag 0x10)',
     'attempt-time-one-octet': 'call attempt elapsed time read from one octet: 128-255 (BER 00 '
                               'xx) show 0, the second octet is skipped (flag 0x10)',
     'tshark-shows-octet-garbled': 'not our rule: tshark shows the calling party\'s category '
@@ -856,12 +858,12 @@ def argument_range(root):
 
 
 PASSES = ('md', 'display', 'view', 'keys')
-# TCAP-level rules that leave bits unread in the dialogue portion of a valid
-# message (flag 0x10, or 0x2 for the members not found after them).
-FLAGGING_RULES = {'acn-partial', 'result-after-partial-acn', 'asn1-indefinite',
-                  'pdu-indefinite'}
-# Rules of ours inside an argument that skip octets of a valid encoding.
-FLAGGING_ARGUMENT_RULES = {'attempt-time-one-octet'}
+# Rules of ours that leave bits of a valid message unread, and the error
+# flags they raise: TCAP-level ones (the dialogue portion's, and the
+# end-of-contents of an indefinite Invoke) and one inside an argument.
+FLAGGING_RULES = {'acn-partial': 0x10, 'result-after-partial-acn': 0x10,
+                  'asn1-indefinite': 0x12, 'pdu-indefinite': 0x10, 'invoke-indefinite': 0x10}
+FLAGGING_ARGUMENT_RULES = {'attempt-time-one-octet': 0x10}
 
 
 def check_coverage(op, hexmsg, out, arg_range, stats, flagging):
@@ -877,7 +879,10 @@ def check_coverage(op, hexmsg, out, arg_range, stats, flagging):
                if bad((out.get(p) or {}).get(key))]
         if not hit:
             continue
-        if key == 'errorFlags' and flagging:
+        allowed = 0
+        for r in flagging:
+            allowed |= FLAGGING_RULES.get(r, 0) | FLAGGING_ARGUMENT_RULES.get(r, 0)
+        if key == 'errorFlags' and all(v & ~allowed == 0 for _, v in hit):
             stats.rule('flags 0x%x under %s' % (hit[0][1], '+'.join(sorted(flagging))), hexmsg)
             continue
         problems.append('%s: %s' % (what, ', '.join('%s %s' % (p, hex(v) if key == 'errorFlags'
@@ -888,7 +893,7 @@ def check_coverage(op, hexmsg, out, arg_range, stats, flagging):
             covered.update(range((first - 1) // 8, (last - 1) // 8 + 1))
     lo, hi = arg_range
     gaps = [o for o in range(lo, hi) if o not in covered]
-    if gaps and flagging & FLAGGING_ARGUMENT_RULES:
+    if gaps and flagging & set(FLAGGING_ARGUMENT_RULES):
         stats.rule('octets skipped under %s' % '+'.join(sorted(flagging)), hexmsg)
     elif gaps:
         problems.append('argument octets not in any field: %s' % _ranges(gaps))
@@ -933,13 +938,15 @@ def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
         if rng is None:
             stats.failures.append(('corpus', op, 'no argument found', hexmsg))
             continue
+        if root.kid(0x6C).kids[0].indef:
+            notes.add('invoke-indefinite')
         rules = set()
         if op == 56:
             stats.rule('opcode-56-not-decoded-by-tshark', hexmsg)
         else:
             rules = compare_values(op, hexmsg, tfields, out.get('md') or {}, rng, stats)
         check_coverage(op, hexmsg, out, rng, stats,
-                       (notes & FLAGGING_RULES) | (rules & FLAGGING_ARGUMENT_RULES))
+                       (notes & set(FLAGGING_RULES)) | (rules & set(FLAGGING_ARGUMENT_RULES)))
     return stats
 
 
