@@ -686,7 +686,7 @@ def main(argv=None):
             shutil.rmtree(work, ignore_errors=True)
 
     report(stats, len(corpus), len(mutated), time.time() - started, args.show)
-    lines, cc_bad = call_control.report(cc_stats, args.show)
+    lines, cc_bad = call_control.report(cc_stats, args.show, args.per_op >= 200)
     print('%d call-control messages (%d operations) compared with tshark and decoded with '
           'all passes' % (len(cc_corpus), len(call_control.OPERATIONS)))
     print('\n'.join(lines))
