@@ -402,9 +402,9 @@ def build_corpus(per_op, seed):
                 indef = set(rng.sample(parts, rng.randint(1, len(parts))))
             msg = rng.choice(('begin', 'continue', 'end', 'unidirectional'))
             dialogue = rng.random() < .6
-            hexmsg = c.wrap_invoke(code, argument(code, rng), msg=msg, invoke_id=rng.randint(-128, 127),
-                                   dialogue=dialogue, acn=c.default_acn(name, 4),
-                                   indef=indef, otid='%08X' % rng.getrandbits(32),
+            hexmsg = c.wrap_invoke(code, argument(code, rng), msg=msg,
+                                   invoke_id=rng.randint(-128, 127), dialogue=dialogue,
+                                   acn=c.default_acn(name, 4), indef=indef, otid='%08X' % rng.getrandbits(32),
                                    dtid='%08X' % rng.getrandbits(32))
             out.append(('%d/%s' % (code, 'definite' if definite else 'indefinite'), hexmsg))
     return out
@@ -976,7 +976,8 @@ def report(stats, show, complete=True):
         for key in sorted(stats.rules):
             cnt, ex = stats.rules[key]
             lines.append('  %-36s %6d  %s' % (key, cnt, RULE_TEXT.get(key, '')))
-            lines.append('  %36s         e.g. %s' % ('', ex if len(ex) <= 120 else ex[:117] + '...'))
+            lines.append('  %36s         e.g. %s'
+                         % ('', ex if len(ex) <= 120 else ex[:117] + '...'))
     for name in sorted(stats.by_value):
         for (want, got), (cnt, op, hexmsg) in sorted(stats.by_value[name].items(),
                                                    key=lambda kv: -kv[1][0])[:show]:
