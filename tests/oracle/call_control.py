@@ -404,7 +404,8 @@ def build_corpus(per_op, seed):
             dialogue = rng.random() < .6
             hexmsg = c.wrap_invoke(code, argument(code, rng), msg=msg,
                                    invoke_id=rng.randint(-128, 127), dialogue=dialogue,
-                                   acn=c.default_acn(name, 4), indef=indef, otid='%08X' % rng.getrandbits(32),
+                                   acn=c.default_acn(name, 4), indef=indef,
+                                   otid='%08X' % rng.getrandbits(32),
                                    dtid='%08X' % rng.getrandbits(32))
             out.append(('%d/%s' % (code, 'definite' if definite else 'indefinite'), hexmsg))
     return out
