@@ -585,6 +585,18 @@ def t_explicit(show, raw, off, size, data):
     return data[off - 2:off + size].hex(), None
 
 
+def t_octet_at(i):
+    """One octet of a value tshark shows as octets only."""
+    def f(show, raw, off, size, data):
+        return data[off + i], None
+    return f
+
+
+def t_octets_int(show, raw, off, size, data):
+    """Octets shown by tshark as bytes, read as one number."""
+    return int.from_bytes(data[off:off + size], 'big'), None
+
+
 def t_sending(show, raw, off, size, data):
     return 128, None
 
@@ -601,7 +613,8 @@ def o_num(f):
 
 
 def o_digits(f):
-    return ''.join('%x' % s[2] for s in f['spans'])
+    """Every span as hexadecimal digits: one per half-octet, two per octet."""
+    return ''.join('%0*x' % ((s[1] - s[0] + 4) // 4, s[2]) for s in f['spans'])
 
 
 # --------------------------------------------------------------------------
@@ -723,6 +736,25 @@ VALUES = tuple(
     ('leg id: side value', None, ('inap.sendingSideID', 'inap.receivingSideID',
                                   'camel.sendingSideID', 'camel.receivingSideID'),
      (1554,), t_hexint, o_num),
+    ('monitor mode', None, ('camel.monitorMode',), (1909,), t_int, o_num),
+    ('application timer', None, ('camel.applicationTimer',), (1916,), t_int, o_num),
+    ('misc call info: message type', None, ('inap.messageType',), (1608,), t_int, o_num),
+    ('CG encountered', None, ('camel.cGEncountered',), (1637,), t_int, o_num),
+    ('call segment id', None, ('camel.callSegmentID', 'camel.newCallSegment'), (4181,),
+     t_octets, o_digits),
+    ('CUG index', None, ('camel.cug_Index',), (1193,), t_int, o_num),
+    ('CUG interlock', None, ('camel.cug_Interlock',), (1948,), t_octets_int, o_num),
+    ('NA Oli info', None, ('camel.naOliInfo',), (2017,), t_hexint, o_num),
+    ('carrier selection', None, ('camel.carrier',), (1955,), t_octet_at(0), o_num),
+    ('alerting pattern: type', None, ('camel.alertingPattern',), (1128,), t_octet_at(2), o_num),
+    ('service interaction: conference treatment', None,
+     ('camel.conferenceTreatmentIndicator',), (1977,), t_hexint, o_num),
+    ('service interaction: hold treatment', None, ('camel.holdTreatmentIndicator',), (2001,),
+     t_int, o_num),
+    ('service interaction: bothway through connection', None,
+     ('camel.bothwayThroughConnectionInd',), (1993,), t_int, o_num),
+    ('service interaction: connected number treatment', None,
+     ('camel.connectedNumberTreatmentInd',), (1996,), t_int, o_num),
     ('cancel: invoke id', None, ('camel.invokeID',), (1531,), t_int8, o_num),
     ('timer id', None, ('camel.timerID',), (2306,), t_int, o_num),
     ('timer value', None, ('camel.timervalue',), (1376,), t_int, o_num),
