@@ -678,9 +678,12 @@ def main(argv=None):
         for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
             compare(i, group, hexmsg, o, u.get('md') or {}, stats)
         check_mutated(mutated, mut, stats)
-        cc_stats = call_control.check(cc_corpus, call_control.read_pdml(cc_pdml),
-                                      read_jsonl(cc_ora), read_jsonl(cc_ours), parse_node,
-                                      tcap_rules)
+        cc_outputs = (call_control.read_pdml(cc_pdml), read_jsonl(cc_ora), read_jsonl(cc_ours))
+        if any(len(x) != len(cc_corpus) for x in cc_outputs):
+            print('FAILED: call-control output counts: tshark %d, oracle %d, ours %d of %d'
+                  % tuple([len(x) for x in cc_outputs] + [len(cc_corpus)]))
+            return 1
+        cc_stats = call_control.check(cc_corpus, *cc_outputs, parse_node, tcap_rules)
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
