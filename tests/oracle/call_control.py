@@ -100,8 +100,11 @@ def cause(rng):
 
 
 def bearer_cap(rng):
-    """Q.931 bearer capability: transfer capability and rate, maybe layer 1."""
-    b = bytes([0x80 | rng.choice([0, 8, 9, 16, 17, 24]), 0x80 | rng.choice([17, 19, 21, 23])])
+    """Q.931 bearer capability: transfer capability and rate (multirate with
+    its rate multiplier, octet 4.1), maybe layer 1."""
+    rate = rng.choice([17, 19, 21, 23, 24])
+    b = bytes([0x80 | rng.choice([0, 8, 9, 16, 17, 24]), 0x80 | rate])
+    b += bytes([0x80 | rng.randint(2, 30)]) if rate == 24 else b''
     return b + (bytes([0xA0 | rng.choice([2, 3, 5])]) if rng.random() < .5 else b'')
 
 
@@ -697,6 +700,8 @@ VALUES = tuple(
     ('bearer transfer capability', None, ('q931.information_transfer_capability',), (1704,),
      t_int, o_num),
     ('bearer transfer rate', None, ('q931.information_transfer_rate',), (1707,), t_int, o_num),
+    ('bearer rate multiplier', None, ('q931.bearer_capability.rate_multiplier',), (1712,),
+     t_int, o_num),
     ('bearer transfer mode', None, ('q931.transfer_mode',), (1708,), t_int, o_num),
     ('bearer layer 1 protocol', None, ('q931.uil1',), (1725,), t_int, o_num),
     ('IMSI digits', ('camel.iMSI',), ('e212.imsi',), (2025, 2029), t_digits, o_digits),
