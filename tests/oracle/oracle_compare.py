@@ -21,6 +21,11 @@ It also decodes malformed variants (capgen mutate) with all four passes and
 checks that every pass returns 1, that every reported bit span lies inside
 the message and that the decoder does not crash.
 
+The call-control arguments (call_control.py beside this script) are checked
+value by value against tshark on messages with random arguments, and every
+octet of each argument must lie in a reported field of a clean four-pass
+decode.
+
 Exit status: 0 all agree, 1 disagreements or a crash, 77 skipped (the
 reference tools or tshark are missing).  Python 3 standard library only.
 """
@@ -56,10 +61,9 @@ F_INVOKE_ID, F_LINKED_ID = 3705, 3708
 F_OPCODE, F_RESULT_OPCODE, F_ERROR_CODE = 1066, 1068, 1070
 F_PROBLEM_TYPE = 3701
 
-# Return results and errors are recognised, but what follows their invoke
-# id (the result's operation code, the error code) is not decoded yet, so
-# those two values are compared only once it is.
-RESULT_AND_ERROR_CODES_DECODED = False
+# The result's operation code and the error code are compared (both are
+# decoded after the invoke id of their component).
+RESULT_AND_ERROR_CODES_DECODED = True
 PROBLEM_CODE_FIELDS = {3710: 0x80, 3712: 0x81, 3714: 0x82, 3716: 0x83}
 
 COMPONENT_BY_FIELD = {F_INVOKE: 'invoke', F_RESULT_LAST: 'returnResultLast',
@@ -423,6 +427,16 @@ def component_expectations(cp, ora_comps, e, notes):
         e['components'].append(c)
 
 
+def tcap_rules(data, root, ora):
+    """The TCAP-level rules that apply to a message (names of RULE_TEXT)."""
+    notes = set()
+    try:
+        expect(data, root, ora, notes)
+    except Disagreement:
+        pass
+    return notes
+
+
 # --------------------------------------------------------------------------
 # Comparison
 # --------------------------------------------------------------------------
@@ -590,6 +604,8 @@ def main(argv=None):
                     help='messages per message type and length form (default 1000)')
     ap.add_argument('--mutations', type=int, default=2000,
                     help='malformed messages decoded with all passes (default 2000)')
+    ap.add_argument('--per-op', type=int, default=240,
+                    help='call-control messages per operation (default 240)')
     ap.add_argument('--seed', type=int, default=29078)
     ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
     ap.add_argument('--keep', help='keep the generated and decoded files in this folder')
@@ -609,26 +625,39 @@ def main(argv=None):
     sys.path.insert(0, str(tools))
     sys.dont_write_bytecode = True     # leave the shared tools folder as it is
     import capgen  # noqa: E402 (found only at run time)
+    sys.path.insert(0, str(here))
+    import call_control  # noqa: E402
 
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
     mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
+    cc_corpus = call_control.build_corpus(args.per_op, args.seed)
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)
     try:
         src, msrc = work / 'corpus.txt', work / 'mutated.txt'
+        ccsrc = work / 'call_control.txt'
         write_hex(src, corpus)
         write_hex(msrc, mutated)
+        write_hex(ccsrc, cc_corpus)
         ora_out, our_out, mut_out = work / 'oracle.jsonl', work / 'ours.jsonl', work / 'mutated.jsonl'
+        cc_ora, cc_pdml, cc_ours = (work / 'cc_oracle.jsonl', work / 'cc_oracle.pdml',
+                                    work / 'cc_ours.jsonl')
         jobs = {
             'oracle.py': [sys.executable, str(tools / 'oracle.py'), str(src), '--jsonl', '-q',
                           '--no-hex', '--tshark', args.tshark, '-o', str(ora_out)],
             'dpx-decode (corpus)': decoder + ['--format', 'json', '--pass', 'md', str(src)],
             'dpx-decode (mutated)': decoder + ['--format', 'json',
                                                '--pass', 'md,display,view,keys', str(msrc)],
+            'oracle.py (call control)': [sys.executable, str(tools / 'oracle.py'), str(ccsrc),
+                                         '--jsonl', '-q', '--no-hex', '--tshark', args.tshark,
+                                         '-o', str(cc_ora), '--pdml', str(cc_pdml)],
+            'dpx-decode (call control)': decoder + ['--format', 'json',
+                                                    '--pass', 'md,display,view,keys', str(ccsrc)],
         }
-        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out}
+        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out,
+                'dpx-decode (call control)': cc_ours}
         procs = {}
         for name, cmd in jobs.items():
             stdout = open(outs[name], 'w') if name in outs else subprocess.DEVNULL
@@ -655,12 +684,24 @@ def main(argv=None):
         for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
             compare(i, group, hexmsg, o, u.get('md') or {}, stats)
         check_mutated(mutated, mut, stats)
+        cc_outputs = (call_control.read_pdml(cc_pdml), read_jsonl(cc_ora), read_jsonl(cc_ours))
+        if any(len(x) != len(cc_corpus) for x in cc_outputs):
+            print('FAILED: call-control output counts: tshark %d, oracle %d, ours %d of %d'
+                  % tuple([len(x) for x in cc_outputs] + [len(cc_corpus)]))
+            return 1
+        cc_stats = call_control.check(cc_corpus, *cc_outputs, parse_node, tcap_rules)
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
 
     report(stats, len(corpus), len(mutated), time.time() - started, args.show)
-    return 1 if stats.failures else 0
+    lines, cc_bad = call_control.report(cc_stats, args.show, args.per_op >= 200)
+    print('%d call-control messages (%d operations) compared with tshark and decoded with '
+          'all passes' % (len(cc_corpus), len(call_control.OPERATIONS)))
+    print('\n'.join(lines))
+    print('PASSED (call control)' if not cc_bad else
+          'FAILED (call control): %d disagreements' % cc_bad)
+    return 1 if stats.failures or cc_bad else 0
 
 
 def report(stats, n, n_mut, seconds, show):
