@@ -11,39 +11,15 @@
 #include "support/harness.h"
 
 using camel::test::Bytes;
+using camel::test::argumentTexts;
 using camel::test::decode;
+using camel::test::tlv;
+using camel::test::invoke;
 using camel::test::hexBytes;
 using camel::test::Span;
 using Texts = std::vector<std::string>;
 
 namespace {
-
-Bytes tlv(uint8_t tag, const Bytes &content) {
-    Bytes out{tag, static_cast<uint8_t>(content.size())};
-    out.insert(out.end(), content.begin(), content.end());
-    return out;
-}
-
-// A Begin carrying one Invoke (id 1) of `opcode` with the argument octets.
-Bytes invoke(uint8_t opcode, const std::string &argument) {
-    Bytes component = hexBytes("02 01 01 02 01");
-    component.push_back(opcode);
-    const Bytes arg = hexBytes(argument);
-    component.insert(component.end(), arg.begin(), arg.end());
-    Bytes content = hexBytes("48 01 01");
-    const Bytes portion = tlv(0x6C, tlv(0xA1, component));
-    content.insert(content.end(), portion.begin(), portion.end());
-    return tlv(0x62, content);
-}
-
-// The decoded-field texts after the operation code.
-Texts argumentTexts(const camel::test::Decoded &d) {
-    const Texts all = d.texts();
-    for (size_t i = 0; i < d.fields.size(); ++i)
-        if (d.fields[i].id == 1066)
-            return Texts(all.begin() + long(i) + 1, all.end());
-    return {};
-}
 
 TEST(Arguments, ElementLoopTakesMembersInAnyOrderAndAgain) {
     // Initial DP: Gsm Forwarding Pending, Call Reference Number, Gsm

@@ -13,6 +13,7 @@
 #include "support/harness.h"
 
 using camel::test::Bytes;
+using camel::test::argumentTexts;
 using camel::test::decode;
 using camel::test::hexBytes;
 using camel::test::Span;
@@ -33,15 +34,6 @@ Bytes endWithInvoke(uint8_t opcode, const std::string &argument) {
     out[9] = static_cast<uint8_t>(invoke.size() + 2);
     out[1] = static_cast<uint8_t>(out.size() - 2);
     return out;
-}
-
-// The decoded-field texts after the operation code.
-Texts argumentTexts(const camel::test::Decoded &d) {
-    const Texts all = d.texts();
-    for (size_t i = 0; i < d.fields.size(); ++i)
-        if (d.fields[i].id == 1066)
-            return Texts(all.begin() + long(i) + 1, all.end());
-    return {};
 }
 
 // Arguments whose every element is decoded by the units of this area.

@@ -13,17 +13,12 @@
 
 using camel::test::Bytes;
 using camel::test::decode;
+using camel::test::tlv;
 using camel::test::hexBytes;
 using camel::test::Span;
 using Texts = std::vector<std::string>;
 
 namespace {
-
-Bytes tlv(uint8_t tag, const Bytes &content) {
-    Bytes out{tag, uint8_t(content.size())};
-    out.insert(out.end(), content.begin(), content.end());
-    return out;
-}
 
 // A Begin holding one Invoke of operation `op` whose argument is a SEQUENCE
 // of the given elements (or the given argument itself when `sequence` is

@@ -291,4 +291,35 @@ uint32_t checkReallocFailures(const Bytes &message) {
     return points;
 }
 
+Bytes tlv(uint8_t tag, const Bytes &content) {
+    Bytes out{tag};
+    const auto n = static_cast<uint32_t>(content.size());
+    const int octets = n < 0x80 ? 0 : n < 0x100 ? 1 : n < 0x10000 ? 2 : 3;
+    if (octets != 0)
+        out.push_back(static_cast<uint8_t>(0x80 + octets));
+    for (int i = octets > 0 ? octets - 1 : 0; i >= 0; --i)
+        out.push_back(static_cast<uint8_t>(n >> (8 * i)));
+    out.insert(out.end(), content.begin(), content.end());
+    return out;
+}
+
+Bytes invoke(uint8_t op, std::string_view argumentHex) {
+    Bytes component = hexBytes("02 01 01 02 01");
+    component.push_back(op);
+    const Bytes argument = hexBytes(argumentHex);
+    component.insert(component.end(), argument.begin(), argument.end());
+    Bytes content = hexBytes("48 01 01");
+    const Bytes portion = tlv(0x6C, tlv(0xA1, component));
+    content.insert(content.end(), portion.begin(), portion.end());
+    return tlv(0x62, content);
+}
+
+std::vector<std::string> textsAfter(const Decoded &d, uint32_t fieldId) {
+    const std::vector<std::string> all = d.texts();
+    for (size_t i = 0; i < d.fields.size(); ++i)
+        if (d.fields[i].id == fieldId)
+            return std::vector<std::string>(all.begin() + long(i) + 1, all.end());
+    return {};
+}
+
 } // namespace camel::test

@@ -100,4 +100,20 @@ uint32_t checkReallocFailures(const Bytes &message);
 // The decoded-field texts of a message joined by newlines.
 std::string textDump(const Decoded &d);
 
+// ---- Building messages and reading them back -----------------------------------
+
+// A BER element with a definite length (short or long form).
+Bytes tlv(uint8_t tag, const Bytes &content);
+
+// A Begin (originating id 01) carrying one Invoke (id 1) of operation `op`
+// whose argument octets are `argumentHex`.
+Bytes invoke(uint8_t op, std::string_view argumentHex);
+
+// The decoded-field texts after the first field with id `fieldId` (
+// none when there is no such field).
+std::vector<std::string> textsAfter(const Decoded &d, uint32_t fieldId);
+
+// The texts of an Invoke's argument: those after its operation code.
+inline std::vector<std::string> argumentTexts(const Decoded &d) { return textsAfter(d, 1066); }
+
 } // namespace camel::test

@@ -13,24 +13,13 @@
 
 using camel::test::Bytes;
 using camel::test::decode;
+using camel::test::tlv;
 using camel::test::hexBytes;
 using camel::test::Span;
 using Texts = std::vector<std::string>;
 
 namespace {
 
-// BER element with a definite length (short or long form).
-Bytes tlv(uint8_t tag, const Bytes &content) {
-    Bytes out{tag};
-    const auto n = static_cast<uint32_t>(content.size());
-    const int octets = n < 0x80 ? 0 : n < 0x100 ? 1 : n < 0x10000 ? 2 : 3;
-    if (octets != 0)
-        out.push_back(static_cast<uint8_t>(0x80 + octets));
-    for (int i = octets > 0 ? octets - 1 : 0; i >= 0; --i)
-        out.push_back(static_cast<uint8_t>(n >> (8 * i)));
-    out.insert(out.end(), content.begin(), content.end());
-    return out;
-}
 
 // A Begin with originating transaction id 01 and the given portion octets.
 Bytes begin(const Bytes &portion) {

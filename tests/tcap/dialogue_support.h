@@ -16,20 +16,6 @@ inline Bytes cat(std::initializer_list<Bytes> parts) {
     return out;
 }
 
-// Definite length, short or long form.
-inline Bytes tlv(uint8_t tag, const Bytes &content) {
-    Bytes out{tag};
-    const size_t n = content.size();
-    if (n < 0x80) {
-        out.push_back(static_cast<uint8_t>(n));
-    } else if (n < 0x100) {
-        out.insert(out.end(), {0x81, static_cast<uint8_t>(n)});
-    } else {
-        out.insert(out.end(), {0x82, static_cast<uint8_t>(n >> 8), static_cast<uint8_t>(n)});
-    }
-    return cat({out, content});
-}
-
 // Indefinite length closed by 00 00.
 inline Bytes indef(uint8_t tag, const Bytes &content) {
     return cat({Bytes{tag, 0x80}, content, Bytes{0, 0}});

@@ -10,16 +10,11 @@
 
 using camel::test::Bytes;
 using camel::test::decode;
+using camel::test::tlv;
 using camel::test::hexBytes;
 using Texts = std::vector<std::string>;
 
 namespace {
-
-Bytes tlv(uint8_t tag, const Bytes &content) {
-    Bytes out{tag, static_cast<uint8_t>(content.size())};
-    out.insert(out.end(), content.begin(), content.end());
-    return out;
-}
 
 // An End carrying one component `tag` (A2 or A3) for invoke id 3 with the
 // octets that follow the invoke id.
@@ -33,14 +28,6 @@ Bytes component(uint8_t tag, const std::string &after) {
     return tlv(0x64, message);
 }
 
-// The decoded-field texts after the invoke id.
-Texts afterInvokeId(const camel::test::Decoded &d) {
-    const Texts all = d.texts();
-    for (size_t i = 0; i < d.fields.size(); ++i)
-        if (d.fields[i].id == 3705)
-            return Texts(all.begin() + long(i) + 1, all.end());
-    return {};
-}
 
 struct Case {
     const char *name;
@@ -53,7 +40,7 @@ struct Case {
 void check(const Case &c) {
     SCOPED_TRACE(c.name);
     const auto d = decode(component(c.component, c.after));
-    EXPECT_EQ(afterInvokeId(d), c.texts);
+    EXPECT_EQ(camel::test::textsAfter(d, 3705), c.texts);
     EXPECT_EQ(d.md.errorFlags, c.flags);
     EXPECT_EQ(d.md.remainingBits, 0u);
 }
