@@ -139,7 +139,8 @@ struct CallStopTime {
 };
 
 constexpr Member kRequestedInfoValue[] = {
-    alt(0x80, "Call Attempt Elapsed Time Value", 1509, octet(1510)),
+    // INTEGER (0..255): 128 to 255 take two octets (00 xx).
+    alt(0x80, "Call Attempt Elapsed Time Value", 1509, integer(1510, 2)),
     alt(0x81, "Call Stop Time Value", 1511, unitOf<CallStopTime>()),
     alt(0x82, "Call Connect Elapsed Time Value", 1518, integer(1519, 4)),
     alt(0x9E, "Release Cause", 0, CAMEL_UNIT(decodeCause)),

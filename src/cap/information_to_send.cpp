@@ -47,10 +47,11 @@ int decodeDateVariablePart(DecodeState *st, ElementContext *ctx, Request<P> *rq)
 struct GenericDigitsIds {
     FieldIndex scheme;
     FieldIndex bcd;
+    FieldIndex ia5;
     FieldIndex binary;
 };
-constexpr GenericDigitsIds kDigitsInGenericContext{fx(3530), fx(3536), fx(3548)};
-constexpr GenericDigitsIds kDigitsElsewhere{fx(3533), fx(3539), fx(3551)};
+constexpr GenericDigitsIds kDigitsInGenericContext{fx(3530), fx(3536), fx(3542), fx(3548)};
+constexpr GenericDigitsIds kDigitsElsewhere{fx(3533), fx(3539), fx(3545), fx(3551)};
 constexpr uint32_t kGenericContextBit = 0x800000;
 
 // A number variable part: the type of digits (bits 1-5, nothing consumed),
@@ -128,9 +129,9 @@ constexpr MemberTable kInformationToSendTable = members(Walk::Choice, kInformati
 
 // Encoding scheme (bits 6-8 of the octet whose bits 1-5 the type of digits
 // has shown), then the digits: BCD digits low half first, or binary-coded
-// octets as hexadecimal digits, as many as the element holds.  IA5
-// characters and the spare schemes are not shown: their octets stay in the
-// element's window.
+// octets as hexadecimal digits, as many as the element holds, or IA5
+// characters (at most 20).  The spare schemes are not shown: their octets
+// stay in the element's window.
 template <Pass P>
 int decodeGenericDigits(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     const GenericDigitsIds &ids = (g_scratch<P>.tagContext & kGenericContextBit) != 0
@@ -144,6 +145,8 @@ int decodeGenericDigits(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     case 0: // BCD, even number of digits
     case 1: // BCD, odd number of digits: the filler is shown as a digit
         return bcdDigitsField<P>(st, ctx, rq, ids.bcd, st->remainingBits / 4);
+    case 2: // IA5 characters, at most 20
+        return octetsField<P>(st, ctx, rq, ids.ia5, 20);
     case 3: // binary coded
         return halfOctetField<P>(st, ctx, rq, ids.binary, st->remainingBits / 8);
     default:

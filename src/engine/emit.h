@@ -116,6 +116,13 @@ inline void renderValue(const FieldDef &f, const FieldRecord &field, TextBuf &ou
     case Render::Enum:
         out.append(nameOf(f, field.value, display));
         break;
+    case Render::Chars:
+        for (uint32_t i = 0; i < field.spansReported; ++i) {
+            const uint32_t c = field.spans[i].value;
+            const char shown = c >= 0x20 && c < 0x7F ? static_cast<char>(c) : '.';
+            out.append(&shown, 1);
+        }
+        break;
     }
 }
 
@@ -157,6 +164,7 @@ int report(DecodeState *st, Request<P> *rq, FieldIndex index) {
             text.append(f.label);
             text.append("=", 1);
             text.append(value.data, value.len);
+            text.append(f.suffix);
             pu_AddDecodedFieldsData(rq, st->field.spansReported, st->field.spans, text.data,
                                     detail::spanSelector(f, st->field.spansReported),
                                     st->field.label, f.id, 0, 0);

@@ -16,6 +16,7 @@ enum class Render : uint8_t {
     Hex,         // "%x"
     Digits,      // "%x" of every span, in span order
     Enum,        // the value's name; empty when it has none
+    Chars,       // every span as a character (IA5), '.' for what cannot be shown
 };
 
 // Where a key field's value goes in the key buffer.
@@ -46,6 +47,9 @@ struct FieldDef {
     // The name of a value that neither table lists ("Reserved" in some
     // tables); empty by default.
     const char *otherName = "";
+    // Text that follows the value in the decoded-field text ("h" after a
+    // value shown in hexadecimal); the display pass shows the value alone.
+    const char *suffix = "";
     int8_t keyEntry = -1;          // key table entry, -1 for none
     KeyForm keyForm = KeyForm::None;
     uint8_t selector = 0xFF;       // span selector override; 0xFF: derived
@@ -67,6 +71,11 @@ struct FieldDef {
         FieldDef f = *this;
         f.displayNames = shown;
         f.displayNameCount = static_cast<uint16_t>(N);
+        return f;
+    }
+    constexpr FieldDef followedBy(const char *text) const {
+        FieldDef f = *this;
+        f.suffix = text;
         return f;
     }
     constexpr FieldDef otherwise(const char *name) const {
@@ -108,6 +117,9 @@ constexpr FieldDef hexField(uint32_t id, const char *label, uint16_t width = 8) 
 }
 constexpr FieldDef digitsField(uint32_t id, const char *label) {
     return FieldDef{.id = id, .label = label, .render = Render::Digits, .width = 0};
+}
+constexpr FieldDef charsField(uint32_t id, const char *label) {
+    return FieldDef{.id = id, .label = label, .render = Render::Chars, .width = 0};
 }
 template <size_t N>
 constexpr FieldDef enumField(uint32_t id, const char *label, const ValueName (&names)[N],

@@ -96,7 +96,7 @@ TEST(Charging, ArgumentsFieldByField) {
           "  LENGTH=3 octet(s)", "  Integer Value=123456", "  Number Tag=81", "  LENGTH=3 octet(s)",
           "  Type Of Digits=Res Authorisation Code", "  Encoding Scheme=Bcd Odd", "  Bcd Digits=1234", "Time Tag=82",
           "  LENGTH=2 octet(s)", "  Hour=13", "  Minute=45", "Date Tag=83", "  LENGTH=4 octet(s)", "  Year=2024",
-          "  Month=5", "  Day=17", "Price Tag=84", "  LENGTH=4 octet(s)", "  Price Value=1250"},
+          "  Month=5", "  Day=17", "Price Tag=84", "  LENGTH=4 octet(s)", "  Price Value=1250h"},
          0},
         {"Play Announcement: text, then message ids repeated", 47,
          "30 1A A0 18 A0 16 A0 0A A1 08 80 02 48 69 81 02 0A B0 A0 08 BD 06 02 01 05 02 01 06",

@@ -466,14 +466,6 @@ def t_int8(show, raw, off, size, data):            # tshark shows it signed
     return int(show) % 256, None
 
 
-def t_one_octet(show, raw, off, size, data):
-    """A value our decoder reads from the first content octet only: 128 to
-    255 take two octets in BER (00 xx); ours then shows 0 and skips xx."""
-    if size > 1:
-        return data[off], 'attempt-time-one-octet'
-    return int(show), None
-
-
 def t_hexint(show, raw, off, size, data):          # "02" (leg ids are hex)
     return int(show, 16), None
 
@@ -768,7 +760,7 @@ VALUES = tuple(
     ('requested info type (request)', None, ('camel.RequestedInformationType',), (1527,),
      t_int, o_num),
     ('call attempt elapsed time', None, ('camel.callAttemptElapsedTimeValue',), (1510,),
-     t_one_octet, o_num),
+     t_int, o_num),
     ('call connected elapsed time', None, ('camel.callConnectedElapsedTimeValue',), (1519,),
      t_int, o_num),
     ('call stop time: year', None, ('camel.callStopTimeValue',), (1512,), t_stop_time(0), o_num),
@@ -816,8 +808,6 @@ RULE_TEXT = {
     'stop-time-octets': 'call stop time shows its octets as on the wire, the year as one '
                         '16-bit read, low octet first (tshark: swapped BCD date and time)',
     'invoke-indefinite': 'TCAP: an indefinite Invoke\'s end-of-contents is not read (flag 0x10)',
-    'attempt-time-one-octet': 'call attempt elapsed time read from one octet: 128-255 (BER 00 '
-                              'xx) show 0, the second octet is skipped (flag 0x10)',
     'tshark-shows-octet-garbled': 'not our rule: tshark shows the calling party\'s category '
                                   'through a mis-sized integer; the octet is compared',
     'opcode-56-not-decoded-by-tshark': 'operation 56 (Continue With Argument, old code): '
@@ -906,7 +896,7 @@ PASSES = ('md', 'display', 'view', 'keys')
 # end-of-contents of an indefinite Invoke) and one inside an argument.
 FLAGGING_RULES = {'acn-partial': 0x10, 'result-after-partial-acn': 0x10,
                   'asn1-indefinite': 0x12, 'pdu-indefinite': 0x10, 'invoke-indefinite': 0x10}
-FLAGGING_ARGUMENT_RULES = {'attempt-time-one-octet': 0x10}
+FLAGGING_ARGUMENT_RULES = {}
 
 
 def check_coverage(op, hexmsg, out, arg_range, stats, flagging):

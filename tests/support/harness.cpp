@@ -200,12 +200,17 @@ Decoded decode(const Bytes &message) {
     EXPECT_EQ(d.status, d.md.errorFlags != 0 ? DPX_STATUS_INVALID : 0);
     EXPECT_EQ(d.shown.size(), d.fields.size());
     for (size_t i = 0; i < d.fields.size() && i < d.shown.size(); ++i) {
-        const std::string &text = d.fields[i].text;
+        std::string text = d.fields[i].text;
         const std::string &value = d.shown[i].text;
         // A field with display names of its own may show another name.
         const size_t at = camel::fieldIndex(d.fields[i].id);
         if (at < camel::kFieldCount && camel::kFields[at].displayNameCount != 0)
             continue;
+        // ... and a value with a suffix in its text is shown without it.
+        const std::string suffix = at < camel::kFieldCount ? camel::kFields[at].suffix : "";
+        if (!suffix.empty() && text.size() >= suffix.size() &&
+            text.compare(text.size() - suffix.size(), suffix.size(), suffix) == 0)
+            text.resize(text.size() - suffix.size());
         EXPECT_TRUE(text.size() >= value.size() &&
                     text.compare(text.size() - value.size(), value.size(), value) == 0)
             << "display text '" << value << "' does not end the field text '" << text << "'";
