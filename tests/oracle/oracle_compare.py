@@ -604,8 +604,9 @@ def main(argv=None):
                     help='messages per message type and length form (default 1000)')
     ap.add_argument('--mutations', type=int, default=2000,
                     help='malformed messages decoded with all passes (default 2000)')
-    ap.add_argument('--per-op', type=int, default=240,
-                    help='call-control messages per operation (default 240)')
+    ap.add_argument('--per-op', type=int, default=200,
+                    help='messages per call-control or charging operation, result operation '
+                         'code and error code (default 200)')
     ap.add_argument('--seed', type=int, default=29078)
     ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
     ap.add_argument('--keep', help='keep the generated and decoded files in this folder')
@@ -627,11 +628,13 @@ def main(argv=None):
     import capgen  # noqa: E402 (found only at run time)
     sys.path.insert(0, str(here))
     import call_control  # noqa: E402
+    import charging  # noqa: E402
 
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
     mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
     cc_corpus = call_control.build_corpus(args.per_op, args.seed)
+    ch_corpus = charging.build_corpus(args.per_op, args.seed)
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)
@@ -641,6 +644,10 @@ def main(argv=None):
         write_hex(src, corpus)
         write_hex(msrc, mutated)
         write_hex(ccsrc, cc_corpus)
+        chsrc = work / 'charging.txt'
+        write_hex(chsrc, ch_corpus)
+        ch_ora, ch_pdml, ch_ours = (work / 'ch_oracle.jsonl', work / 'ch_oracle.pdml',
+                                    work / 'ch_ours.jsonl')
         ora_out, our_out, mut_out = work / 'oracle.jsonl', work / 'ours.jsonl', work / 'mutated.jsonl'
         cc_ora, cc_pdml, cc_ours = (work / 'cc_oracle.jsonl', work / 'cc_oracle.pdml',
                                     work / 'cc_ours.jsonl')
@@ -655,9 +662,14 @@ def main(argv=None):
                                          '-o', str(cc_ora), '--pdml', str(cc_pdml)],
             'dpx-decode (call control)': decoder + ['--format', 'json',
                                                     '--pass', 'md,display,view,keys', str(ccsrc)],
+            'oracle.py (charging)': [sys.executable, str(tools / 'oracle.py'), str(chsrc),
+                                     '--jsonl', '-q', '--no-hex', '--tshark', args.tshark,
+                                     '-o', str(ch_ora), '--pdml', str(ch_pdml)],
+            'dpx-decode (charging)': decoder + ['--format', 'json',
+                                                '--pass', 'md,display,view,keys', str(chsrc)],
         }
         outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out,
-                'dpx-decode (call control)': cc_ours}
+                'dpx-decode (call control)': cc_ours, 'dpx-decode (charging)': ch_ours}
         procs = {}
         for name, cmd in jobs.items():
             stdout = open(outs[name], 'w') if name in outs else subprocess.DEVNULL
@@ -690,6 +702,12 @@ def main(argv=None):
                   % tuple([len(x) for x in cc_outputs] + [len(cc_corpus)]))
             return 1
         cc_stats = call_control.check(cc_corpus, *cc_outputs, parse_node, tcap_rules)
+        ch_outputs = (call_control.read_pdml(ch_pdml), read_jsonl(ch_ora), read_jsonl(ch_ours))
+        if any(len(x) != len(ch_corpus) for x in ch_outputs):
+            print('FAILED: charging output counts: tshark %d, oracle %d, ours %d of %d'
+                  % tuple([len(x) for x in ch_outputs] + [len(ch_corpus)]))
+            return 1
+        ch_stats = charging.check(ch_corpus, *ch_outputs, parse_node, tcap_rules)
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
@@ -701,7 +719,15 @@ def main(argv=None):
     print('\n'.join(lines))
     print('PASSED (call control)' if not cc_bad else
           'FAILED (call control): %d disagreements' % cc_bad)
-    return 1 if stats.failures or cc_bad else 0
+    lines, ch_bad = charging.report(ch_stats, args.show, args.per_op >= 200)
+    print('%d charging, call gap and announcement messages (%d operations), results (%d '
+          'operation codes) and errors (%d codes) compared with tshark and decoded with all '
+          'passes' % (len(ch_corpus), len(charging.OPERATIONS), len(charging.RESULTS),
+                      len(charging.error_codes())))
+    print('\n'.join(lines))
+    print('PASSED (charging, results, errors)' if not ch_bad else
+          'FAILED (charging, results, errors): %d disagreements' % ch_bad)
+    return 1 if stats.failures or cc_bad or ch_bad else 0
 
 
 def report(stats, n, n_mut, seconds, show):
