@@ -55,7 +55,8 @@ def generic_digits(rng, schemes=(0, 1, 3)):
 SIDE = one(1, 2)
 SENDING = leg(0)
 BURST = some((
-    (.6, '80', int_in((1, 3))), (.6, '81', int_in((1, 127))), (.6, '82', int_in((1, 3))),
+    (.6, '80', int_in((1, 3))), (.6, '81', int_in((1, 127), (1, 127), (128, 1200))),
+    (.6, '82', int_in((1, 3))),
     (.6, '83', int_in((1, 20))), (.6, '84', int_in((1, 20))),
 ))
 AUDIBLE_INDICATOR = choice((
@@ -87,7 +88,7 @@ CALL_RESULT = some((
 ))
 FCI = some((
     (1, 'A0', some((
-        (1, '80', lambda rng: octets(rng, 1, rng.choice((8, 40, 52)))),
+        (1, '80', lambda rng: octets(rng, 1, rng.choice((8, 40, 52, 160)))),
         (.6, 'A1', SENDING), (.5, '82', one(0, 1)),
     ))),
 ))
@@ -125,8 +126,20 @@ INFORMATION_TO_SEND = choice((
                     (.5, '81', int_in((0, 127), (128, 2 ** 31 - 1)))))),
 ))
 # duration -2..86400, gapInterval -1..60000 (our interval: two octets)
+COMPOUND_GAP_CRITERIA = some((
+    (1, 'A0', BASIC_GAP_CRITERIA), (.5, '81', lambda rng: octets(rng, 1, 4))))
+
+
+def gap_criteria(rng):
+    """GapCriteria: a basic criterion, or the compound one (30)."""
+    if rng.random() < .8:
+        return BASIC_GAP_CRITERIA(rng)
+    return _c().tlv(0x30, COMPOUND_GAP_CRITERIA(rng))
+
+
+
 CALL_GAP = some((
-    (1, 'A0', BASIC_GAP_CRITERIA),
+    (1, 'A0', gap_criteria),
     (1, 'A1', some(((1, '80', int_in((-2, 127), (128, 86400))),
                     (1, '81', int_in((-1, 127), (128, 32767), (32768, 60000)))))),
     (.4, '82', one(0, 1)),
@@ -185,7 +198,7 @@ RESULTS = {
         (.7, '80', lambda rng: bytes([rng.randint(0, 7)]) + bytes([rng.choice([0x80, 0xC0,
                                                                                0xE0, 0xF0])])),
         (.6, '81', lambda rng: bytes([rng.randint(0, 7)]) + octets(rng, 1, 2)),
-        (.1, 'A2', extensions)))(rng)),
+        (.1, 'A2', extensions), (.2, '83', null)))(rng)),
 }
 
 
@@ -311,6 +324,22 @@ def t_gap_interval(show, raw, off, size, data):
     return int.from_bytes(data[off:off + size], 'big'), None
 
 
+def t_one_octet(show, raw, off, size, data):
+    """A burst value, read from one octet: 128-1200 (two octets in BER)
+    show their first octet, the second is left over (flag 0x10)."""
+    if size > 1:
+        return data[off], 'burst-value-one-octet'
+    return int(show), None
+
+
+def t_free_format_data(show, raw, off, size, data):
+    """Free format data: at most 52 octets shown, the rest (up to 160 in
+    CAP v3 and v4) is left over (flag 0x10)."""
+    if size > 52:
+        return data[off:off + 52].hex(), 'free-format-data-52-octets'
+    return data[off:off + size].hex(), None
+
+
 def t_generic_digits(show, raw, off, size, data):
     """Generic Digits as tshark shows them (all octets, the type-of-digits
     octet first): BCD digits low half first, every half-octet (an odd count
@@ -350,18 +379,20 @@ VALUES = (
     ('tariff switch interval', None, ('camel.tariffSwitchInterval',), (1396,), t_int, o_num),
     ('warning tone', None, ('camel.tone',), (4237,), t_bool, o_bool),
     ('warning period', None, ('camel.warningPeriod',), (4243,), t_int, o_num),
-    ('burst: number of bursts', None, ('camel.numberOfBursts',), (4254,), t_int, o_num),
-    ('burst: interval', None, ('camel.burstInterval',), (4257,), t_int, o_num),
-    ('burst: tones in burst', None, ('camel.numberOfTonesInBurst',), (4260,), t_int, o_num),
+    ('burst: number of bursts', None, ('camel.numberOfBursts',), (4254,), t_one_octet, o_num),
+    ('burst: interval', None, ('camel.burstInterval',), (4257,), t_one_octet, o_num),
+    ('burst: tones in burst', None, ('camel.numberOfTonesInBurst',), (4260,), t_one_octet,
+     o_num),
     ('burst: tone duration', ('camel.bursts_element', 'camel.PlayToneArg_element'),
-     ('camel.toneDuration',), (4263,), t_int, o_num),
-    ('burst: tone interval', None, ('camel.toneInterval',), (4266,), t_int, o_num),
+     ('camel.toneDuration',), (4263,), t_one_octet, o_num),
+    ('burst: tone interval', None, ('camel.toneInterval',), (4266,), t_one_octet, o_num),
     # Apply Charging Report
     ('time if no tariff switch', None, ('camel.timeIfNoTariffSwitch',), (1415,), t_int, o_num),
     ('time since tariff switch', None, ('camel.timeSinceTariffSwitch',), (1420,), t_int, o_num),
     ('call active', None, ('camel.legActive',), (1423,), t_bool, o_bool),
     # Furnish / Send Charging Information
-    ('free format data', None, ('camel.freeFormatData',), (2188,), t_octets, o_digits),
+    ('free format data', None, ('camel.freeFormatData',), (2188,), t_free_format_data,
+     o_digits),
     ('append free format data', None, ('camel.appendFreeFormatData',), (2191,), t_int, o_num),
     ('AOC: E1-E7', None, tuple('camel.e%d' % n for n in range(1, 8)),
      tuple(1283 + 3 * n for n in range(7)), t_int, o_num),
@@ -428,13 +459,24 @@ RULE_TEXT = dict(cc.RULE_TEXT, **{
     'external-indefinite': 'TCAP: an indefinite EXTERNAL in a definite dialogue portion is '
                            'read in definite mode: its end-of-contents is left in the dialogue '
                            'portion\'s window (flag 0x10)',
+    'burst-value-one-octet': 'burst values read from one octet: a burst interval of '
+                             '128-1200 (BER two octets) shows its first octet, the second is '
+                             'left over (flag 0x10)',
+    'free-format-data-52-octets': 'free format data shows at most 52 octets; the rest of a '
+                                  'longer one (CAP v3/v4: up to 160) is left over (flag 0x10)',
+    'call-attempt-result-three-members': 'Initiate Call Attempt result: a loop of three members '
+                                         '(phases, functionalities, extensions); '
+                                         'releaseCallArgExtensionAllowed [3] is left over '
+                                         '(flag 0x10)',
     'result-sequence-indefinite': 'indefinite result SEQUENCE: one end-of-contents check '
                                   'before the operation code, none after the result, so its '
                                   'end-of-contents is left over (flag 0x10)',
 })
 # Rules inside the payload that leave octets of a valid encoding unread,
 # and the error flags they raise.
-FLAGGING_PAYLOAD_RULES = {'gap-interval-two-octets': 0x10, 'result-sequence-indefinite': 0x10}
+FLAGGING_PAYLOAD_RULES = {'gap-interval-two-octets': 0x10, 'result-sequence-indefinite': 0x10,
+                         'burst-value-one-octet': 0x10, 'free-format-data-52-octets': 0x10,
+                         'call-attempt-result-three-members': 0x10}
 
 ROWS = [cc._row(r) for r in VALUES]
 
@@ -477,6 +519,10 @@ def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
         dlg = root.kid(0x6B)
         if dlg is not None and not dlg.indef and dlg.kids and dlg.kids[0].indef:
             notes.add('external-indefinite')
+        if comp.tag == 0xA2 and len(comp.kids[1].kids) > 1 and \
+                any(k.tag == 0x83 for k in comp.kids[1].kids[1].kids):
+            stats.rule('call-attempt-result-three-members', hexmsg)
+            notes.add('call-attempt-result-three-members')
         if comp.tag == 0xA2 and comp.kids[1].indef:
             notes.add('result-sequence-indefinite')
         rules = cc.compare_values(label, hexmsg, tfields, out.get('md') or {}, (lo, hi), stats,
