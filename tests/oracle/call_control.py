@@ -376,6 +376,9 @@ OPERATIONS = {
 }
 
 
+CONTENTS = '%d operations' % len(OPERATIONS)
+
+
 def argument(code, rng):
     _, outer, build = OPERATIONS[code]
     content = build(rng)
@@ -971,32 +974,48 @@ def _ranges(octets):
 # --------------------------------------------------------------------------
 # Driver
 # --------------------------------------------------------------------------
-def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
+def argument_payload(root, stats, hexmsg):
+    """(first, end, rule names) of the Invoke's argument, or None."""
+    rng = argument_range(root)
+    if rng is None:
+        return None
+    return rng[0], rng[1], {'invoke-indefinite'} if root.kid(0x6C).kids[0].indef else set()
+
+
+def check(corpus, pdml, oracle, ours, parse_node, tcap_rules, payload=argument_payload,
+          label=lambda group: int(group.split('/')[0]), rows=None, payload_rules=None):
     """corpus [(group, hex)], tshark's PDML fields and oracle summaries, our
     four-pass outputs; parse_node: BER reader; tcap_rules(data, root, ora)
-    -> set of TCAP-level rule names (oracle_compare's expectations)."""
+    -> set of TCAP-level rule names (oracle_compare's expectations).
+    payload(root, stats, hex) -> (first, end, rule names) of the checked
+    octets; label(group) names the message's operation in the summary;
+    rows: the compared values (VALUES); payload_rules: rules inside the
+    payload that leave octets unread, and their flags."""
+    payload_rules = FLAGGING_ARGUMENT_RULES if payload_rules is None else payload_rules
     stats = Stats()
     for (group, hexmsg), tfields, ora, out in zip(corpus, pdml, oracle, ours):
-        op = int(group.split('/')[0])
+        op = label(group)
         data = bytes.fromhex(hexmsg)
         root = parse_node(data, 0)
         notes = tcap_rules(data, root, ora)
         if notes & {'msg-indefinite', 'dialogue-indefinite'}:
             stats.rule('components-not-reached', hexmsg)
             continue
-        rng = argument_range(root)
-        if rng is None:
+        found = payload(root, stats, hexmsg)
+        if found is None:
             stats.failures.append(('corpus', op, 'no argument found', hexmsg))
             continue
-        if root.kid(0x6C).kids[0].indef:
-            notes.add('invoke-indefinite')
+        lo, hi, more = found
+        notes |= more
         rules = set()
         if op == 56:
             stats.rule('opcode-56-not-decoded-by-tshark', hexmsg)
         else:
-            rules = compare_values(op, hexmsg, tfields, out.get('md') or {}, rng, stats)
-        check_coverage(op, hexmsg, out, rng, stats,
-                       (notes & set(FLAGGING_RULES)) | (rules & set(FLAGGING_ARGUMENT_RULES)))
+            rules = compare_values(op, hexmsg, tfields, out.get('md') or {}, (lo, hi), stats,
+                                   rows)
+        check_coverage(op, hexmsg, out, (lo, hi), stats,
+                       ((notes | rules) & set(payload_rules)) | (notes & set(FLAGGING_RULES)),
+                       payload_rules)
     return stats
 
 

@@ -202,6 +202,10 @@ RESULTS = {
 }
 
 
+CONTENTS = '%d operations, %d result operation codes, every error code' % (
+    len(OPERATIONS), len(RESULTS))
+
+
 def _error_parameter(code, rng):
     """The parameter of the errors that carry one: Cancel Failed's problem
     and invoke id, the requested-info error, the unavailable network
@@ -481,57 +485,37 @@ FLAGGING_PAYLOAD_RULES = {'gap-interval-two-octets': 0x10, 'result-sequence-inde
 ROWS = [cc._row(r) for r in VALUES]
 
 
-def payload_range(root):
-    """(first, end, kind) of the checked octets of the message's component:
-    an Invoke's argument, a Return Result's SEQUENCE, a Return Error's code
-    and parameter; None if the message holds none."""
+def payload(root, stats, hexmsg):
+    """(first, end, rule names) of the checked octets of the message's
+    component: an Invoke's argument, a Return Result's SEQUENCE, a Return
+    Error's code and parameter; None if the message holds none."""
     cp = root.kid(0x6C)
     if cp is None or not cp.kids:
         return None
     comp = cp.kids[0]
-    if comp.tag == 0xA1 and len(comp.kids) >= 3:
-        return comp.kids[-1].off, comp.kids[-1].end, comp
-    if comp.tag == 0xA2 and len(comp.kids) >= 2:
-        return comp.kids[1].off, comp.kids[1].end, comp
-    if comp.tag == 0xA3 and len(comp.kids) >= 2:
-        return comp.kids[1].off, comp.kids[-1].end, comp
-    return None
+    first = 2 if comp.tag == 0xA1 else 1
+    if comp.tag not in (0xA1, 0xA2, 0xA3) or len(comp.kids) <= first:
+        return None
+    notes = set()
+    if comp.indef:
+        notes.add('invoke-indefinite' if comp.tag == 0xA1 else 'component-indefinite')
+    dlg = root.kid(0x6B)
+    if dlg is not None and not dlg.indef and dlg.kids and dlg.kids[0].indef:
+        notes.add('external-indefinite')
+    if comp.tag == 0xA2:
+        result = comp.kids[1]
+        if result.indef:
+            notes.add('result-sequence-indefinite')
+        if len(result.kids) > 1 and any(k.tag == 0x83 for k in result.kids[1].kids):
+            stats.rule('call-attempt-result-three-members', hexmsg)
+            notes.add('call-attempt-result-three-members')
+    return comp.kids[-1 if comp.tag == 0xA1 else 1].off, comp.kids[-1].end, notes
 
 
 def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
-    """As call_control.check, for this module's corpus."""
-    stats = cc.Stats()
-    for (group, hexmsg), tfields, ora, out in zip(corpus, pdml, oracle, ours):
-        label = group.split('/')[0]
-        data = bytes.fromhex(hexmsg)
-        root = parse_node(data, 0)
-        notes = tcap_rules(data, root, ora)
-        if notes & {'msg-indefinite', 'dialogue-indefinite'}:
-            stats.rule('components-not-reached', hexmsg)
-            continue
-        found = payload_range(root)
-        if found is None:
-            stats.failures.append(('corpus', label, 'no component found', hexmsg))
-            continue
-        lo, hi, comp = found
-        if comp.indef:
-            notes.add('invoke-indefinite' if comp.tag == 0xA1 else 'component-indefinite')
-        dlg = root.kid(0x6B)
-        if dlg is not None and not dlg.indef and dlg.kids and dlg.kids[0].indef:
-            notes.add('external-indefinite')
-        if comp.tag == 0xA2 and len(comp.kids[1].kids) > 1 and \
-                any(k.tag == 0x83 for k in comp.kids[1].kids[1].kids):
-            stats.rule('call-attempt-result-three-members', hexmsg)
-            notes.add('call-attempt-result-three-members')
-        if comp.tag == 0xA2 and comp.kids[1].indef:
-            notes.add('result-sequence-indefinite')
-        rules = cc.compare_values(label, hexmsg, tfields, out.get('md') or {}, (lo, hi), stats,
-                                  ROWS)
-        cc.check_coverage(label, hexmsg, out, (lo, hi), stats,
-                          (notes & (set(cc.FLAGGING_RULES) | set(FLAGGING_PAYLOAD_RULES)))
-                          | (rules & set(FLAGGING_PAYLOAD_RULES)),
-                          FLAGGING_PAYLOAD_RULES)
-    return stats
+    """call_control.check over this module's corpus, payloads and values."""
+    return cc.check(corpus, pdml, oracle, ours, parse_node, tcap_rules, payload,
+                    lambda group: group.split('/')[0], ROWS, FLAGGING_PAYLOAD_RULES)
 
 
 def report(stats, show, complete=True):

@@ -633,43 +633,39 @@ def main(argv=None):
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
     mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
-    cc_corpus = call_control.build_corpus(args.per_op, args.seed)
-    ch_corpus = charging.build_corpus(args.per_op, args.seed)
+    # The argument suites: (name, module, corpus); each module builds its
+    # corpus, checks tshark's and our outputs and reports.
+    suites = [(name, module, module.build_corpus(args.per_op, args.seed))
+              for name, module in (('call control', call_control), ('charging', charging))]
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)
     try:
         src, msrc = work / 'corpus.txt', work / 'mutated.txt'
-        ccsrc = work / 'call_control.txt'
         write_hex(src, corpus)
         write_hex(msrc, mutated)
-        write_hex(ccsrc, cc_corpus)
-        chsrc = work / 'charging.txt'
-        write_hex(chsrc, ch_corpus)
-        ch_ora, ch_pdml, ch_ours = (work / 'ch_oracle.jsonl', work / 'ch_oracle.pdml',
-                                    work / 'ch_ours.jsonl')
         ora_out, our_out, mut_out = work / 'oracle.jsonl', work / 'ours.jsonl', work / 'mutated.jsonl'
-        cc_ora, cc_pdml, cc_ours = (work / 'cc_oracle.jsonl', work / 'cc_oracle.pdml',
-                                    work / 'cc_ours.jsonl')
         jobs = {
             'oracle.py': [sys.executable, str(tools / 'oracle.py'), str(src), '--jsonl', '-q',
                           '--no-hex', '--tshark', args.tshark, '-o', str(ora_out)],
             'dpx-decode (corpus)': decoder + ['--format', 'json', '--pass', 'md', str(src)],
             'dpx-decode (mutated)': decoder + ['--format', 'json',
                                                '--pass', 'md,display,view,keys', str(msrc)],
-            'oracle.py (call control)': [sys.executable, str(tools / 'oracle.py'), str(ccsrc),
-                                         '--jsonl', '-q', '--no-hex', '--tshark', args.tshark,
-                                         '-o', str(cc_ora), '--pdml', str(cc_pdml)],
-            'dpx-decode (call control)': decoder + ['--format', 'json',
-                                                    '--pass', 'md,display,view,keys', str(ccsrc)],
-            'oracle.py (charging)': [sys.executable, str(tools / 'oracle.py'), str(chsrc),
-                                     '--jsonl', '-q', '--no-hex', '--tshark', args.tshark,
-                                     '-o', str(ch_ora), '--pdml', str(ch_pdml)],
-            'dpx-decode (charging)': decoder + ['--format', 'json',
-                                                '--pass', 'md,display,view,keys', str(chsrc)],
         }
-        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out,
-                'dpx-decode (call control)': cc_ours, 'dpx-decode (charging)': ch_ours}
+        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out}
+        files = {}
+        for name, _, suite_corpus in suites:
+            stem = work / name.replace(' ', '_')
+            f = files[name] = {k: Path('%s.%s' % (stem, k))
+                               for k in ('txt', 'oracle.jsonl', 'pdml', 'ours.jsonl')}
+            write_hex(f['txt'], suite_corpus)
+            jobs['oracle.py (%s)' % name] = [
+                sys.executable, str(tools / 'oracle.py'), str(f['txt']), '--jsonl', '-q',
+                '--no-hex', '--tshark', args.tshark, '-o', str(f['oracle.jsonl']),
+                '--pdml', str(f['pdml'])]
+            jobs['dpx-decode (%s)' % name] = decoder + [
+                '--format', 'json', '--pass', 'md,display,view,keys', str(f['txt'])]
+            outs['dpx-decode (%s)' % name] = f['ours.jsonl']
         procs = {}
         for name, cmd in jobs.items():
             stdout = open(outs[name], 'w') if name in outs else subprocess.DEVNULL
@@ -696,38 +692,31 @@ def main(argv=None):
         for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
             compare(i, group, hexmsg, o, u.get('md') or {}, stats)
         check_mutated(mutated, mut, stats)
-        cc_outputs = (call_control.read_pdml(cc_pdml), read_jsonl(cc_ora), read_jsonl(cc_ours))
-        if any(len(x) != len(cc_corpus) for x in cc_outputs):
-            print('FAILED: call-control output counts: tshark %d, oracle %d, ours %d of %d'
-                  % tuple([len(x) for x in cc_outputs] + [len(cc_corpus)]))
-            return 1
-        cc_stats = call_control.check(cc_corpus, *cc_outputs, parse_node, tcap_rules)
-        ch_outputs = (call_control.read_pdml(ch_pdml), read_jsonl(ch_ora), read_jsonl(ch_ours))
-        if any(len(x) != len(ch_corpus) for x in ch_outputs):
-            print('FAILED: charging output counts: tshark %d, oracle %d, ours %d of %d'
-                  % tuple([len(x) for x in ch_outputs] + [len(ch_corpus)]))
-            return 1
-        ch_stats = charging.check(ch_corpus, *ch_outputs, parse_node, tcap_rules)
+        suite_stats = []
+        for name, module, suite_corpus in suites:
+            f = files[name]
+            outputs = (call_control.read_pdml(f['pdml']), read_jsonl(f['oracle.jsonl']),
+                       read_jsonl(f['ours.jsonl']))
+            if any(len(x) != len(suite_corpus) for x in outputs):
+                print('FAILED: %s output counts: tshark %d, oracle %d, ours %d of %d'
+                      % tuple([name] + [len(x) for x in outputs] + [len(suite_corpus)]))
+                return 1
+            suite_stats.append(module.check(suite_corpus, *outputs, parse_node, tcap_rules))
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
 
     report(stats, len(corpus), len(mutated), time.time() - started, args.show)
-    lines, cc_bad = call_control.report(cc_stats, args.show, args.per_op >= 200)
-    print('%d call-control messages (%d operations) compared with tshark and decoded with '
-          'all passes' % (len(cc_corpus), len(call_control.OPERATIONS)))
-    print('\n'.join(lines))
-    print('PASSED (call control)' if not cc_bad else
-          'FAILED (call control): %d disagreements' % cc_bad)
-    lines, ch_bad = charging.report(ch_stats, args.show, args.per_op >= 200)
-    print('%d charging, call gap and announcement messages (%d operations), results (%d '
-          'operation codes) and errors (%d codes) compared with tshark and decoded with all '
-          'passes' % (len(ch_corpus), len(charging.OPERATIONS), len(charging.RESULTS),
-                      len(charging.error_codes())))
-    print('\n'.join(lines))
-    print('PASSED (charging, results, errors)' if not ch_bad else
-          'FAILED (charging, results, errors): %d disagreements' % ch_bad)
-    return 1 if stats.failures or cc_bad or ch_bad else 0
+    bad = 0
+    for (name, module, suite_corpus), suite in zip(suites, suite_stats):
+        lines, suite_bad = module.report(suite, args.show, args.per_op >= 200)
+        print('%d %s messages (%s) compared with tshark and decoded with all passes'
+              % (len(suite_corpus), name, module.CONTENTS))
+        print('\n'.join(lines))
+        print('PASSED (%s)' % name if not suite_bad else
+              'FAILED (%s): %d disagreements' % (name, suite_bad))
+        bad += suite_bad
+    return 1 if stats.failures or bad else 0
 
 
 def report(stats, n, n_mut, seconds, show):
