@@ -429,6 +429,28 @@ VALUES = (
     ('variable part: date day', None, ('camel.date',), (1368,), cc.t_octet_at(3), o_num),
     ('variable part: price', None, ('camel.price',), (1371,), t_octets, o_digits),
     ('call segment id', None, ('camel.callSegmentID',), (4181,), t_octets, o_digits),
+    # Play Announcement and Prompt And Collect: flags and collected digits
+    ('disconnect from IP forbidden', None, ('camel.disconnectFromIPForbidden',), (1835,),
+     t_bool, o_bool),
+    ('request announcement complete', None, ('camel.requestAnnouncementCompleteNotification',),
+     (1839,), t_bool, o_bool),
+    ('request announcement started', None, ('camel.requestAnnouncementStartedNotification',),
+     (4237,), t_bool, o_bool),
+) + tuple((name, None, ('camel.' + tname,), (fid,), norm, extract)
+          for name, tname, fid, norm, extract in (
+    ('collected digits: minimum', 'minimumNbOfDigits', 1863, t_int, o_num),
+    ('collected digits: maximum', 'maximumNbOfDigits', 1866, t_int, o_num),
+    ('collected digits: end of reply digit', 'endOfReplyDigit', 1869, t_int_octets, o_num),
+    ('collected digits: cancel digit', 'cancelDigit', 1872, t_int_octets, o_num),
+    ('collected digits: start digit', 'startDigit', 1875, t_int_octets, o_num),
+    ('collected digits: first digit time-out', 'firstDigitTimeOut', 1878, t_int, o_num),
+    ('collected digits: inter-digit time-out', 'interDigitTimeOut', 1881, t_int, o_num),
+    ('collected digits: error treatment', 'errorTreatment', 1884, t_int, o_num),
+    ('collected digits: interruptable announcement', 'interruptableAnnInd', 1887, t_bool,
+     o_bool),
+    ('collected digits: voice information', 'voiceInformation', 1891, t_bool, o_bool),
+    ('collected digits: voice back', 'voiceBack', 1895, t_bool, o_bool),
+)) + (
     # Results
     ('digits response: type of digits', ('camel.digitsResponse',), ('isup.generic_digits',),
      (1647,), t_type_of_digits, o_num),
