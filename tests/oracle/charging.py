@@ -71,9 +71,11 @@ TIME_DURATION_CHARGING = some((
     (.4, 'A3', AUDIBLE_INDICATOR),
     (.1, 'A4', extensions),
 ))
+# AChChargingAddress: legID [2] or srfConnection [50]
+CHARGING_ADDRESS = choice(((1, 'A2', leg(None)), (1, '9F32', integer(1, 127))))
 APPLY_CHARGING = some((
     (1, '80', lambda rng: _c().tlv(0xA0, TIME_DURATION_CHARGING(rng))),
-    (.7, 'A2', SENDING), (.1, 'A3', extensions),
+    (.7, 'A2', SENDING), (.1, 'A3', extensions), (.3, 'BF32', CHARGING_ADDRESS),
 ))
 TIME_VALUE = int_in((0, 127), (128, 32767), (32768, 864000))
 TIME_INFORMATION = choice((
@@ -83,7 +85,7 @@ TIME_INFORMATION = choice((
 CALL_RESULT = some((
     (1, 'A0', some((
         (1, 'A0', leg(1)), (1, 'A1', TIME_INFORMATION), (.7, '82', boolean),
-        (.3, '83', null), (.1, 'A4', extensions),
+        (.3, '83', null), (.1, 'A4', extensions), (.3, 'A5', CHARGING_ADDRESS),
     ))),
 ))
 FCI = some((
@@ -428,7 +430,8 @@ VALUES = (
     ('variable part: date month', None, ('camel.date',), (1367,), cc.t_octet_at(2), o_num),
     ('variable part: date day', None, ('camel.date',), (1368,), cc.t_octet_at(3), o_num),
     ('variable part: price', None, ('camel.price',), (1371,), t_octets, o_digits),
-    ('call segment id', None, ('camel.callSegmentID',), (4181,), t_octets, o_digits),
+    ('call segment id', None, ('camel.callSegmentID', 'camel.srfConnection'), (4181,),
+     t_octets, o_digits),
     # Play Announcement and Prompt And Collect: flags and collected digits
     ('disconnect from IP forbidden', None, ('camel.disconnectFromIPForbidden',), (1835,),
      t_bool, o_bool),
