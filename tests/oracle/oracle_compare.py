@@ -21,10 +21,11 @@ It also decodes malformed variants (capgen mutate) with all four passes and
 checks that every pass returns 1, that every reported bit span lies inside
 the message and that the decoder does not crash.
 
-The call-control arguments (call_control.py beside this script) are checked
-value by value against tshark on messages with random arguments, and every
-octet of each argument must lie in a reported field of a clean four-pass
-decode.
+The call-control arguments (call_control.py beside this script) and the
+charging, call gap and announcement arguments, results and errors
+(charging.py) are checked value by value against tshark on messages with
+random values, and every octet of each argument, result or error must lie
+in a reported field of a clean four-pass decode.
 
 Exit status: 0 all agree, 1 disagreements or a crash, 77 skipped (the
 reference tools or tshark are missing).  Python 3 standard library only.
