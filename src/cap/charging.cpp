@@ -18,13 +18,14 @@ consteval Member tariffSwitchInterval(uint32_t tag) {
 
 // ---- Bursts and the audible indicator ------------------------------------------------
 
-// Every member of a burst is one octet counted in its own unit.
+// Every member of a burst is a small integer counted in its own unit (a
+// burst interval of 128 to 1200 takes two octets).
 constexpr Member kBurst[] = {
-    el(0x80, "numberOfBursts", 4252, 4253, octet(4254)),
-    el(0x81, "Burst Interval", 4255, 4256, octet(4257)),
-    el(0x82, "numberOfTonesInBurst", 4258, 4259, octet(4260)),
-    el(0x83, "toneDuration", 4261, 4262, octet(4263)),
-    el(0x84, "toneInterval", 4264, 4265, octet(4266)),
+    el(0x80, "numberOfBursts", 4252, 4253, integer(4254, 2)),
+    el(0x81, "Burst Interval", 4255, 4256, integer(4257, 2)),
+    el(0x82, "numberOfTonesInBurst", 4258, 4259, integer(4260, 2)),
+    el(0x83, "toneDuration", 4261, 4262, integer(4263, 2)),
+    el(0x84, "toneInterval", 4264, 4265, integer(4266, 2)),
 };
 
 constexpr Member kBurstList[] = {

@@ -376,6 +376,9 @@ OPERATIONS = {
 }
 
 
+CONTENTS = '%d operations' % len(OPERATIONS)
+
+
 def argument(code, rng):
     _, outer, build = OPERATIONS[code]
     content = build(rng)
@@ -840,14 +843,14 @@ class Stats:
         self.rules.setdefault(name, [0, hexmsg])[0] += 1
 
 
-def compare_values(op, hexmsg, tfields, md, arg_range, stats):
+def compare_values(op, hexmsg, tfields, md, arg_range, stats, rows=None):
     """tfields: tshark's fields of one message; md: our decoded-field pass."""
     data = bytes.fromhex(hexmsg)
     lo, hi = arg_range
     ours = [(octet_of(f), f) for f in md.get('fields', []) if f.get('spans')]
     tf = [t for t in tfields if lo <= t[3] < hi]
     rules = set()
-    for name, containers, tnames, ids, norm, extract, shift in ROWS:
+    for name, containers, tnames, ids, norm, extract, shift in rows or ROWS:
         boxes = None
         if containers:
             boxes = [(o, o + s) for n, _, _, o, s in tf if n in containers]
@@ -895,11 +898,12 @@ PASSES = ('md', 'display', 'view', 'keys')
 # flags they raise: TCAP-level ones (the dialogue portion's, and the
 # end-of-contents of an indefinite Invoke) and one inside an argument.
 FLAGGING_RULES = {'acn-partial': 0x10, 'result-after-partial-acn': 0x10,
-                  'asn1-indefinite': 0x12, 'pdu-indefinite': 0x10, 'invoke-indefinite': 0x10}
+                  'asn1-indefinite': 0x12, 'pdu-indefinite': 0x10, 'invoke-indefinite': 0x10,
+                  'component-indefinite': 0x10, 'external-indefinite': 0x10}
 FLAGGING_ARGUMENT_RULES = {}
 
 
-def check_coverage(op, hexmsg, out, arg_range, stats, flagging):
+def check_coverage(op, hexmsg, out, arg_range, stats, flagging, argument_rules=None):
     """Four passes: result 1, no error flag, no bits left over; every octet of
     the argument inside a reported field's bit span.  Error flags (and, for
     a rule inside the argument, the octets it skips) that a rule of ours
@@ -912,9 +916,10 @@ def check_coverage(op, hexmsg, out, arg_range, stats, flagging):
                if bad((out.get(p) or {}).get(key))]
         if not hit:
             continue
+        argument_rules = FLAGGING_ARGUMENT_RULES if argument_rules is None else argument_rules
         allowed = 0
         for r in flagging:
-            allowed |= FLAGGING_RULES.get(r, 0) | FLAGGING_ARGUMENT_RULES.get(r, 0)
+            allowed |= FLAGGING_RULES.get(r, 0) | argument_rules.get(r, 0)
         if key == 'errorFlags' and all(v & ~allowed == 0 for _, v in hit):
             for r in flagging:
                 stats.rule('flags accepted under %s' % r, hexmsg)
@@ -927,13 +932,15 @@ def check_coverage(op, hexmsg, out, arg_range, stats, flagging):
             covered.update(range((first - 1) // 8, (last - 1) // 8 + 1))
     lo, hi = arg_range
     gaps = [o for o in range(lo, hi) if o not in covered]
-    skipping = flagging & set(FLAGGING_ARGUMENT_RULES)
+    skipping = flagging & set(FLAGGING_ARGUMENT_RULES if argument_rules is None
+                              else argument_rules)
     if gaps and skipping:
         for r in skipping:
             stats.rule('octets skipped under %s' % r, hexmsg)
     elif gaps:
         problems.append('argument octets not in any field: %s' % _ranges(gaps))
-    c = stats.compared.setdefault('coverage: op %d' % op, [0, 0])
+    c = stats.compared.setdefault('coverage: %s' % (op if isinstance(op, str) else 'op %d' % op),
+                                  [0, 0])
     c[0] += 1
     if not problems:
         c[1] += 1
@@ -957,41 +964,58 @@ def _ranges(octets):
 # --------------------------------------------------------------------------
 # Driver
 # --------------------------------------------------------------------------
-def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
+def argument_payload(root, stats, hexmsg):
+    """(first, end, rule names) of the Invoke's argument, or None."""
+    rng = argument_range(root)
+    if rng is None:
+        return None
+    return rng[0], rng[1], {'invoke-indefinite'} if root.kid(0x6C).kids[0].indef else set()
+
+
+def check(corpus, pdml, oracle, ours, parse_node, tcap_rules, payload=argument_payload,
+          label=lambda group: int(group.split('/')[0]), rows=None, payload_rules=None):
     """corpus [(group, hex)], tshark's PDML fields and oracle summaries, our
     four-pass outputs; parse_node: BER reader; tcap_rules(data, root, ora)
-    -> set of TCAP-level rule names (oracle_compare's expectations)."""
+    -> set of TCAP-level rule names (oracle_compare's expectations).
+    payload(root, stats, hex) -> (first, end, rule names) of the checked
+    octets; label(group) names the message's operation in the summary;
+    rows: the compared values (VALUES); payload_rules: rules inside the
+    payload that leave octets unread, and their flags."""
+    payload_rules = FLAGGING_ARGUMENT_RULES if payload_rules is None else payload_rules
     stats = Stats()
     for (group, hexmsg), tfields, ora, out in zip(corpus, pdml, oracle, ours):
-        op = int(group.split('/')[0])
+        op = label(group)
         data = bytes.fromhex(hexmsg)
         root = parse_node(data, 0)
         notes = tcap_rules(data, root, ora)
         if notes & {'msg-indefinite', 'dialogue-indefinite'}:
             stats.rule('components-not-reached', hexmsg)
             continue
-        rng = argument_range(root)
-        if rng is None:
+        found = payload(root, stats, hexmsg)
+        if found is None:
             stats.failures.append(('corpus', op, 'no argument found', hexmsg))
             continue
-        if root.kid(0x6C).kids[0].indef:
-            notes.add('invoke-indefinite')
+        lo, hi, more = found
+        notes |= more
         rules = set()
         if op == 56:
             stats.rule('opcode-56-not-decoded-by-tshark', hexmsg)
         else:
-            rules = compare_values(op, hexmsg, tfields, out.get('md') or {}, rng, stats)
-        check_coverage(op, hexmsg, out, rng, stats,
-                       (notes & set(FLAGGING_RULES)) | (rules & set(FLAGGING_ARGUMENT_RULES)))
+            rules = compare_values(op, hexmsg, tfields, out.get('md') or {}, (lo, hi), stats,
+                                   rows)
+        check_coverage(op, hexmsg, out, (lo, hi), stats,
+                       ((notes | rules) & set(payload_rules)) | (notes & set(FLAGGING_RULES)),
+                       payload_rules)
     return stats
 
 
-def report(stats, show, complete=True):
+def report(stats, show, complete=True, rows=None, texts=None, title='call-control arguments'):
     """Summary lines and the number of disagreements.  complete: the corpus
     is large enough that every value of the table must have been met."""
-    lines = ['call-control arguments (value: agreed / compared):']
+    rows, texts = rows or ROWS, texts or RULE_TEXT
+    lines = ['%s (value: agreed / compared):' % title]
     bad = 0
-    for name in [r[0] for r in ROWS if r[0] not in stats.compared] if complete else []:
+    for name in [r[0] for r in rows if r[0] not in stats.compared] if complete else []:
         bad += 1
         lines.append('  NEVER COMPARED %s: tshark showed it nowhere (table or corpus wrong?)'
                      % name)
@@ -1000,17 +1024,17 @@ def report(stats, show, complete=True):
         lines.append('  %-48s %6d / %-6d%s' % (key, a, n, '' if a == n else
                                                  '  <-- %d differ' % (n - a)))
     if stats.rules:
-        lines.append('call-control rules (our rules, tshark differs; messages, example):')
+        lines.append('%s: rules (our rules, tshark differs; messages, example):' % title)
         for key in sorted(stats.rules):
             cnt, ex = stats.rules[key]
-            lines.append('  %-36s %6d  %s' % (key, cnt, RULE_TEXT.get(key, '')))
+            lines.append('  %-36s %6d  %s' % (key, cnt, texts.get(key, '')))
             lines.append('  %36s         e.g. %s'
                          % ('', ex if len(ex) <= 120 else ex[:117] + '...'))
     for name in sorted(stats.by_value):
         for (want, got), (cnt, op, hexmsg) in sorted(stats.by_value[name].items(),
                                                    key=lambda kv: -kv[1][0])[:show]:
             bad += cnt
-            lines.append('  DIFFER %s: expected %s, ours %s (%d, e.g. op %d)\n      %s'
+            lines.append('  DIFFER %s: expected %s, ours %s (%d, e.g. op %s)\n      %s'
                          % (name, want, got, cnt, op, hexmsg))
     seen = {}
     for what, op, text, hexmsg in stats.failures:
@@ -1018,5 +1042,5 @@ def report(stats, show, complete=True):
         k = (op, text.split(':')[0])
         if seen.get(k, 0) < max(1, show // 4):
             seen[k] = seen.get(k, 0) + 1
-            lines.append('  FAIL %s op %d: %s\n      %s' % (what, op, text, hexmsg))
+            lines.append('  FAIL %s op %s: %s\n      %s' % (what, op, text, hexmsg))
     return lines, bad

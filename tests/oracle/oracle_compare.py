@@ -21,10 +21,11 @@ It also decodes malformed variants (capgen mutate) with all four passes and
 checks that every pass returns 1, that every reported bit span lies inside
 the message and that the decoder does not crash.
 
-The call-control arguments (call_control.py beside this script) are checked
-value by value against tshark on messages with random arguments, and every
-octet of each argument must lie in a reported field of a clean four-pass
-decode.
+The call-control arguments (call_control.py beside this script) and the
+charging, call gap and announcement arguments, results and errors
+(charging.py) are checked value by value against tshark on messages with
+random values, and every octet of each argument, result or error must lie
+in a reported field of a clean four-pass decode.
 
 Exit status: 0 all agree, 1 disagreements or a crash, 77 skipped (the
 reference tools or tshark are missing).  Python 3 standard library only.
@@ -604,8 +605,9 @@ def main(argv=None):
                     help='messages per message type and length form (default 1000)')
     ap.add_argument('--mutations', type=int, default=2000,
                     help='malformed messages decoded with all passes (default 2000)')
-    ap.add_argument('--per-op', type=int, default=240,
-                    help='call-control messages per operation (default 240)')
+    ap.add_argument('--per-op', type=int, default=200,
+                    help='messages per call-control or charging operation, result operation '
+                         'code and error code (default 200)')
     ap.add_argument('--seed', type=int, default=29078)
     ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
     ap.add_argument('--keep', help='keep the generated and decoded files in this folder')
@@ -627,37 +629,44 @@ def main(argv=None):
     import capgen  # noqa: E402 (found only at run time)
     sys.path.insert(0, str(here))
     import call_control  # noqa: E402
+    import charging  # noqa: E402
 
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
     mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
-    cc_corpus = call_control.build_corpus(args.per_op, args.seed)
+    # The argument suites: (name, module, corpus); each module builds its
+    # corpus, checks tshark's and our outputs and reports.
+    suites = [(name, module, module.build_corpus(args.per_op, args.seed))
+              for name, module in (('call control', call_control), ('charging', charging))]
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)
     try:
         src, msrc = work / 'corpus.txt', work / 'mutated.txt'
-        ccsrc = work / 'call_control.txt'
         write_hex(src, corpus)
         write_hex(msrc, mutated)
-        write_hex(ccsrc, cc_corpus)
         ora_out, our_out, mut_out = work / 'oracle.jsonl', work / 'ours.jsonl', work / 'mutated.jsonl'
-        cc_ora, cc_pdml, cc_ours = (work / 'cc_oracle.jsonl', work / 'cc_oracle.pdml',
-                                    work / 'cc_ours.jsonl')
         jobs = {
             'oracle.py': [sys.executable, str(tools / 'oracle.py'), str(src), '--jsonl', '-q',
                           '--no-hex', '--tshark', args.tshark, '-o', str(ora_out)],
             'dpx-decode (corpus)': decoder + ['--format', 'json', '--pass', 'md', str(src)],
             'dpx-decode (mutated)': decoder + ['--format', 'json',
                                                '--pass', 'md,display,view,keys', str(msrc)],
-            'oracle.py (call control)': [sys.executable, str(tools / 'oracle.py'), str(ccsrc),
-                                         '--jsonl', '-q', '--no-hex', '--tshark', args.tshark,
-                                         '-o', str(cc_ora), '--pdml', str(cc_pdml)],
-            'dpx-decode (call control)': decoder + ['--format', 'json',
-                                                    '--pass', 'md,display,view,keys', str(ccsrc)],
         }
-        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out,
-                'dpx-decode (call control)': cc_ours}
+        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out}
+        files = {}
+        for name, _, suite_corpus in suites:
+            stem = work / name.replace(' ', '_')
+            f = files[name] = {k: Path('%s.%s' % (stem, k))
+                               for k in ('txt', 'oracle.jsonl', 'pdml', 'ours.jsonl')}
+            write_hex(f['txt'], suite_corpus)
+            jobs['oracle.py (%s)' % name] = [
+                sys.executable, str(tools / 'oracle.py'), str(f['txt']), '--jsonl', '-q',
+                '--no-hex', '--tshark', args.tshark, '-o', str(f['oracle.jsonl']),
+                '--pdml', str(f['pdml'])]
+            jobs['dpx-decode (%s)' % name] = decoder + [
+                '--format', 'json', '--pass', 'md,display,view,keys', str(f['txt'])]
+            outs['dpx-decode (%s)' % name] = f['ours.jsonl']
         procs = {}
         for name, cmd in jobs.items():
             stdout = open(outs[name], 'w') if name in outs else subprocess.DEVNULL
@@ -684,24 +693,31 @@ def main(argv=None):
         for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
             compare(i, group, hexmsg, o, u.get('md') or {}, stats)
         check_mutated(mutated, mut, stats)
-        cc_outputs = (call_control.read_pdml(cc_pdml), read_jsonl(cc_ora), read_jsonl(cc_ours))
-        if any(len(x) != len(cc_corpus) for x in cc_outputs):
-            print('FAILED: call-control output counts: tshark %d, oracle %d, ours %d of %d'
-                  % tuple([len(x) for x in cc_outputs] + [len(cc_corpus)]))
-            return 1
-        cc_stats = call_control.check(cc_corpus, *cc_outputs, parse_node, tcap_rules)
+        suite_stats = []
+        for name, module, suite_corpus in suites:
+            f = files[name]
+            outputs = (call_control.read_pdml(f['pdml']), read_jsonl(f['oracle.jsonl']),
+                       read_jsonl(f['ours.jsonl']))
+            if any(len(x) != len(suite_corpus) for x in outputs):
+                print('FAILED: %s output counts: tshark %d, oracle %d, ours %d of %d'
+                      % tuple([name] + [len(x) for x in outputs] + [len(suite_corpus)]))
+                return 1
+            suite_stats.append(module.check(suite_corpus, *outputs, parse_node, tcap_rules))
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
 
     report(stats, len(corpus), len(mutated), time.time() - started, args.show)
-    lines, cc_bad = call_control.report(cc_stats, args.show, args.per_op >= 200)
-    print('%d call-control messages (%d operations) compared with tshark and decoded with '
-          'all passes' % (len(cc_corpus), len(call_control.OPERATIONS)))
-    print('\n'.join(lines))
-    print('PASSED (call control)' if not cc_bad else
-          'FAILED (call control): %d disagreements' % cc_bad)
-    return 1 if stats.failures or cc_bad else 0
+    bad = 0
+    for (name, module, suite_corpus), suite in zip(suites, suite_stats):
+        lines, suite_bad = module.report(suite, args.show, args.per_op >= 200)
+        print('%d %s messages (%s) compared with tshark and decoded with all passes'
+              % (len(suite_corpus), name, module.CONTENTS))
+        print('\n'.join(lines))
+        print('PASSED (%s)' % name if not suite_bad else
+              'FAILED (%s): %d disagreements' % (name, suite_bad))
+        bad += suite_bad
+    return 1 if stats.failures or bad else 0
 
 
 def report(stats, n, n_mut, seconds, show):

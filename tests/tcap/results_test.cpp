@@ -72,8 +72,8 @@ TEST(Results, ResultSequence) {
          0},
         // The digits response: type of digits (nothing consumed), then the
         // encoding scheme of the same octet and IA5 characters.
-        {"Prompt And Collect, IA5 digits", 0xA2, "30 0C 02 01 30 80 05 41 31 32 7E 07",
-         {"Sequence Tag=30", "LENGTH=12 Octet(s)", "Operation Code Tag=Local Operation Code",
+        {"Prompt And Collect, IA5 digits", 0xA2, "30 0A 02 01 30 80 05 41 31 32 7E 07",
+         {"Sequence Tag=30", "LENGTH=10 Octet(s)", "Operation Code Tag=Local Operation Code",
           "  Length=1 octet(s)", "Operation ID(RetRes)=Prompt And Collect User Info.",
           "  Choice=Digits Response Tag", "LENGTH=5 octet(s)", "  Type Of Digits=Res Authorisation Code",
           "  Encoding Scheme=Ia5character", "IA5 Characters=12~."},
