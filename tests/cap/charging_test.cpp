@@ -36,7 +36,9 @@ Bytes endWithInvoke(uint8_t opcode, const std::string &argument) {
     return out;
 }
 
-// Arguments whose every element is decoded by the units of this area.
+// The hand-written variable parts (time, date, price with its "h") and
+// what caps and unknown alternatives leave over; the values of the other
+// elements are compared with tshark by the reference comparison.
 TEST(Charging, ArgumentsFieldByField) {
     const struct {
         const char *name;
@@ -45,47 +47,6 @@ TEST(Charging, ArgumentsFieldByField) {
         Texts texts;
         uint32_t flags;
     } cases[] = {
-        {"Apply Charging: time duration charging with a tone", 35,
-         "30 14 80 12 A0 10 80 02 04 B0 81 01 00 82 02 0E 10 A3 03 01 01 FF",
-         {"Sequence Tag=30", "  LENGTH=20 octet(s)", "Ach Bill Charging Chars Tag=80", "  LENGTH=18 octet(s)",
-          "Time Duration Charging Tag=a0", "  LENGTH=16 octet(s)", "Max Call Period Duration Tag=80",
-          "  LENGTH=2 octet(s)", "  Max Call Period Duration(100 milliseconds)=1200",
-          "Release IF Duration Exceeded Tag=81", "  LENGTH=1 octet(s)", "  Release If Duration Exceeded Value=False",
-          "Tariff Switch Interval Tag=82", "  LENGTH=2 octet(s)", "  Tariff Switch Interval(second)=3600",
-          "AudibleIndicator Tag=a3", "  LENGTH=3 octet(s)", "AudibleIndicator Type=tone", "  LENGTH=1 octet(s)",
-          "  Boolean Value=True"},
-         0},
-        {"Apply Charging: burst list", 35, "30 16 80 14 A0 12 82 01 3C A3 0D A1 0B 80 01 2D A1 06 80 01 03 83 01 05",
-         {"Sequence Tag=30", "  LENGTH=22 octet(s)", "Ach Bill Charging Chars Tag=80", "  LENGTH=20 octet(s)",
-          "Time Duration Charging Tag=a0", "  LENGTH=18 octet(s)", "Tariff Switch Interval Tag=82",
-          "  LENGTH=1 octet(s)", "  Tariff Switch Interval(second)=60", "AudibleIndicator Tag=a3", "  LENGTH=13 octet(s)",
-          "AudibleIndicator Type=burstList", "  LENGTH=11 octet(s)", "WarningPeriod Tag=80", "  LENGTH=1 octet(s)",
-          "  Warning Period (in seconds)=45", "Burst Tag=a1", "  LENGTH=6 octet(s)", "numberOfBursts Tag=80",
-          "  LENGTH=1 octet(s)", "  Number Of Bursts=3", "toneDuration Tag=83", "  LENGTH=1 octet(s)",
-          "  Tone Duration (in 100 msec units)=5"},
-         0},
-        {"Call Gap: indicators shown in hexadecimal, tone treatment", 41,
-         "30 1C A1 08 80 02 01 2C 81 02 03 E8 82 01 01 A3 0D A0 0B A1 09 80 02 1A 2B 81 03 01 00 00",
-         {"Sequence Tag=30", "  LENGTH=28 octet(s)", "Gap Indicator Tag=a1", "  LENGTH=8 octet(s)", "Duration Tag=80",
-          "  LENGTH=2 octet(s)", "  Duration Value=12c", "Gap Interval Tag=81", "  LENGTH=2 octet(s)",
-          "  Gap Interval Data=3e8", "Control Type Tag=82", "  LENGTH=1 octet(s)", "  Control Type=Manually Initiated",
-          "Gap Treatment Tag=a3", "  LENGTH=13 octet(s)", "Choice=Information To Send Tag", "  LENGTH=11 octet(s)",
-          "Choice=Tone Tag", "  LENGTH=9 octet(s)", "Tone Id Tag=80", "  LENGTH=2 octet(s)", "  Tone Id Info=1a2b",
-          "Duration Tag=81", "  LENGTH=3 octet(s)", "  Duration Info=65536"},
-         0},
-        {"Furnish Charging Information: free format data, append", 34, "04 0A A0 08 80 03 0A 1B 2C 82 01 05",
-         {"Furnish Charging Information Tag=4", "  LENGTH=10 octet(s)", "Camel Fci Bill Cha Char Tag=a0",
-          "  LENGTH=8 octet(s)", "Free Format Data Tag=80", "  LENGTH=3 octet(s)", "  Free Format Data=0a1b2c",
-          "  Append Free FORMAT Data=82", "  LENGTH=1 octet(s)", "  Append Free Format Data=Append"},
-         0},
-        {"Send Charging Information: advice of charge before answer", 46,
-         "30 13 80 11 A0 0F A0 06 80 01 01 86 01 07 A1 05 A0 00 81 01 3C",
-         {"Sequence Tag=30", "  LENGTH=19 octet(s)", "SCI Bill & Charg Char Tag=80", "  LENGTH=17 octet(s)",
-          "Choice=AOC Before Answer Tag", "  LENGTH=15 octet(s)", "  CAI GSM0224 Tag=a0", "  LENGTH=6 octet(s)",
-          "  E1 Tag=80", "  LENGTH=1 octet(s)", "  E1=1", "E7 Tag=86", "  LENGTH=1 octet(s)", "  E7=7",
-          "AOC Subsequent Tag=a1", "  LENGTH=5 octet(s)", "  CAI GSM0224 Tag=a0", "  LENGTH=0 octet(s)",
-          "Tariff Switch Interval Tag=81", "  LENGTH=1 octet(s)", "  Tariff Switch Interval(second)=60"},
-         0},
         {"Play Announcement: variable message with every variable part", 47,
          "30 27 A0 25 A0 23 A0 21 BE 1F 80 01 4D A1 1A 80 03 01 E2 40 81 03 21 21 43 82 02 13 45 83 04 20 24 05 17 "
          "84 04 00 00 12 50",
@@ -97,22 +58,6 @@ TEST(Charging, ArgumentsFieldByField) {
           "  Type Of Digits=Res Authorisation Code", "  Encoding Scheme=Bcd Odd", "  Bcd Digits=1234", "Time Tag=82",
           "  LENGTH=2 octet(s)", "  Hour=13", "  Minute=45", "Date Tag=83", "  LENGTH=4 octet(s)", "  Year=2024",
           "  Month=5", "  Day=17", "Price Tag=84", "  LENGTH=4 octet(s)", "  Price Value=1250h"},
-         0},
-        {"Play Announcement: text, then message ids repeated", 47,
-         "30 1A A0 18 A0 16 A0 0A A1 08 80 02 48 69 81 02 0A B0 A0 08 BD 06 02 01 05 02 01 06",
-         {"Sequence Tag=30", "  LENGTH=26 octet(s)", "Information To Send Tag=a0", "  LENGTH=24 octet(s)",
-          "Choice=Inband Info Tag", "  LENGTH=22 octet(s)", "Message Id Tag=a0", "  LENGTH=10 octet(s)",
-          "Choice=Text Tag", "  LENGTH=8 octet(s)", "Message Content Tag=80", "  LENGTH=2 octet(s)",
-          "  Message Content Info=4869", "Attributes Tag=81", "  LENGTH=2 octet(s)", "  Attributes Info=0ab0",
-          "Message Id Tag=a0", "  LENGTH=8 octet(s)", "Choice=Elementary Messageids Tag", "  LENGTH=6 octet(s)",
-          "Elementary Id Tag=2", "  LENGTH=1 octet(s)", "  Elementary Id Value=5", "Elementary Id Tag=2",
-          "  LENGTH=1 octet(s)", "  Elementary Id Value=6"},
-         0},
-        {"Specialized Resource Report: first announcement started", 49, "9F 33 00",
-         {"SpecializedResourceReportArg Choice=firstAnnouncementStarted", "  LENGTH=0 octet(s)"}, 0},
-        {"Play Tone: a burst", 97, "30 05 A1 03 84 01 0A",
-         {"PlayToneArg Tag=30", "  LENGTH=5 octet(s)", "Burst Tag=a1", "  LENGTH=3 octet(s)", "toneInterval Tag=84",
-          "  LENGTH=1 octet(s)", "  Tone Interval (in 100 msec units)=10"},
          0},
         // Faults: a value longer than its cap keeps its first octets and
         // leaves the rest over; an alternative no choice names is shown

@@ -33,21 +33,13 @@ std::string invoke(unsigned op, const std::string &arg) {
 }
 std::string initialDp(const std::string &members) { return invoke(0, tlv("30", members)); }
 
-// The decoded-field texts from the first field with `id` on.
-Texts from(const Decoded &d, uint32_t id) {
-    const Texts all = d.texts();
-    for (size_t i = 0; i < d.fields.size(); ++i)
-        if (d.fields[i].id == id)
-            return Texts(all.begin() + long(i), all.end());
-    return {};
-}
 
 // Decodes an Initial DP holding `element`; checks the texts from field `id`
 // on and the error flags.
 Decoded expectTexts(const std::string &element, uint32_t id, const Texts &texts, uint32_t flags) {
     SCOPED_TRACE(element);
     const Decoded d = decode(initialDp(element));
-    EXPECT_EQ(from(d, id), texts);
+    EXPECT_EQ(textsFrom(d, id), texts);
     EXPECT_EQ(d.md.errorFlags, flags);
     return d;
 }
@@ -91,7 +83,7 @@ TEST(MobileImsi, DigitCountFollowsTheLengthAndFillsKeyEntry17) {
     for (const auto &c : cases) {
         SCOPED_TRACE(c.content);
         const Decoded d = decode(initialDp(tlv("9F 32", c.content)));
-        EXPECT_EQ(from(d, 2018), c.texts);
+        EXPECT_EQ(textsFrom(d, 2018), c.texts);
         EXPECT_EQ(d.md.errorFlags, 0u);
         const Key *k = d.key(17);
         ASSERT_NE(k, nullptr);
@@ -184,7 +176,7 @@ TEST(MobileLocationInformation, EveryMemberInItsOrder) {
                                 "87 02 AB CD "                                   // geodetic
                                 "88 00 ";                                        // current location
     const Decoded d = decode(initialDp(tlv("BF 34", members)));
-    EXPECT_EQ(from(d, 2031),
+    EXPECT_EQ(textsFrom(d, 2031),
               (Texts{"Location Information Tag=34bf", "  LENGTH=67 octet(s)",
                      "  Age Of Location Information=2", "  LENGTH=2 octet(s)",
                      "  Age Of Location Information=300",
@@ -232,11 +224,11 @@ TEST(MobileLocationInformation, EveryMemberInItsOrder) {
     // Members come in their order only: an age after the VLR number is left
     // over, as are ten octets of an ISDN address beyond its 16 digits.
     const Decoded late = decode(initialDp(tlv("BF 34", "81 02 91 21 02 01 05")));
-    EXPECT_EQ(from(late, 2059).back(), "  ISDN Address Digits=12");
+    EXPECT_EQ(textsFrom(late, 2059).back(), "  ISDN Address Digits=12");
     EXPECT_EQ(late.find(2046), nullptr);
     EXPECT_EQ(late.md.errorFlags, DPX_ERR_LEFTOVER);
     const Decoded longVlr = decode(initialDp(tlv("BF 34", "81 0B 91 21 43 65 87 A9 21 43 65 87 A9")));
-    EXPECT_EQ(from(longVlr, 2058), (Texts{"  ISDN Address Digits=123456789a123456"}));
+    EXPECT_EQ(textsFrom(longVlr, 2058), (Texts{"  ISDN Address Digits=123456789a123456"}));
     EXPECT_EQ(longVlr.md.errorFlags, DPX_ERR_LEFTOVER);
 }
 
@@ -255,47 +247,6 @@ TEST(MobileSubscriberState, AlternativeChosenByItsIdentifier) {
         texts.insert(texts.end(), c.texts.begin(), c.texts.end());
         expectTexts(tlv("BF 33", c.content), 2110, texts, c.flags);
     }
-}
-
-TEST(MobileInitialDp, CugIndexCalledBcdNumberAndArgumentExtension) {
-    const Decoded simple = decode(initialDp(tlv("9F 2D", "01 2C") + tlv("9F 38", "A1 21 43 65 F7") +
-                                            tlv("9F 38", "C5 21")));
-    EXPECT_EQ(from(simple, 1191),
-              (Texts{"CUG Index Tag=2d9f", "  LENGTH=2 octet(s)", "  CUG Index=300",
-                     "Called Party Bcd Number Tag=389f", "  LENGTH=5 octet(s)",
-                     "  Number Plan Identification=ISDN/tele Num Plan (e.164/e.163)",
-                     "  Type Of Number=National Number", "  Number Digits=1234567f",
-                     "Called Party Bcd Number Tag=389f", "  LENGTH=2 octet(s)",
-                     "  Number Plan Identification=Reserved", "  Type Of Number=Dedicated Pad Access, Short Code",
-                     "  Number Digits=12"}));
-
-    // Members in any order; the octet strings take every content octet.
-    const std::string extension = "8A 01 BB 80 03 91 21 F3 82 03 57 18 A0 83 08 53 61 20 00 12 34 56 7F "
-                                  "84 01 07 85 01 80 A7 03 83 01 11 A8 02 91 81 89 01 AA";
-    const Decoded d = decode(initialDp(tlv("BF 3B", extension)));
-    EXPECT_EQ(from(d, 1196),
-              (Texts{"Initial DP Arg Extension Tag=3bbf", "  LENGTH=41 octet(s)",
-                     "  LowLayerCompatibility Tag=8a", "  LENGTH=1 octet(s)", "  LowLayerCompatibility Info=bb",
-                     "GSMC Address Tag=80", "  LENGTH=3 octet(s)", "  Numbering Plan Ind=ISDN/telephony Number Plan",
-                     "  Nature Of Address=International Number", "  Extension Indicator=No Extension",
-                     "  ISDN Address Digits=123f",
-                     "  MS_Classmark2 Tag=82", "  LENGTH=3 octet(s)", "  MS_Classmark2 Info=5718a0",
-                     "  IMEI Tag=83", "  LENGTH=8 octet(s)", "  IMEI Info=536120001234567f",
-                     "  SupportedCamelPhases Tag=84", "  LENGTH=1 octet(s)", "  SupportedCamelPhases Info=07",
-                     "  OfferedCamel4Functionalities Tag=85", "  LENGTH=1 octet(s)",
-                     "  OfferedCamel4Functionalities Info=80",
-                     "  Ext_BasicServiceCode Tag=a7", "  LENGTH=3 octet(s)", "  Ext_BasicServiceCode Info=830111",
-                     "  HighLayerCompatibility Tag=a8", "  LENGTH=2 octet(s)", "  HighLayerCompatibility Info=9181",
-                     "  LowLayerCompatibility Tag=89", "  LENGTH=1 octet(s)", "  LowLayerCompatibility Info=aa"}));
-    EXPECT_EQ(d.md.errorFlags, 0u);
-}
-
-TEST(MobileTimers, ResetTimerIdAndValue) {
-    const Decoded d = decode(invoke(33, tlv("30", "80 01 00 81 03 01 00 00 80 01 01")));
-    EXPECT_EQ(from(d, 2304),
-              (Texts{"  Timer Id Tag=80", "  LENGTH=1 octet(s)", "  Timer Id Value=Tssf", "  Timer Value Tag=81",
-                     "  LENGTH=3 octet(s)", "  Timer Value Info(second)=65536", "  Timer Id Tag=80",
-                     "  LENGTH=1 octet(s)", "  Timer Id Value="}));
 }
 
 // ---- Units the operation tables do not reach yet, run from their length on ----

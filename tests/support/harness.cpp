@@ -319,12 +319,26 @@ Bytes invoke(uint8_t op, std::string_view argumentHex) {
     return tlv(0x62, content);
 }
 
-std::vector<std::string> textsAfter(const Decoded &d, uint32_t fieldId) {
+std::vector<std::string> textsFrom(const Decoded &d, uint32_t fieldId) {
     const std::vector<std::string> all = d.texts();
     for (size_t i = 0; i < d.fields.size(); ++i)
         if (d.fields[i].id == fieldId)
-            return std::vector<std::string>(all.begin() + long(i) + 1, all.end());
+            return std::vector<std::string>(all.begin() + long(i), all.end());
     return {};
+}
+
+std::vector<std::string> textsAfter(const Decoded &d, uint32_t fieldId) {
+    std::vector<std::string> from = textsFrom(d, fieldId);
+    if (!from.empty())
+        from.erase(from.begin());
+    return from;
+}
+
+std::string shownOf(const Decoded &d, uint32_t fieldId) {
+    for (size_t i = 0; i < d.fields.size() && i < d.shown.size(); ++i)
+        if (d.fields[i].id == fieldId)
+            return d.shown[i].text;
+    return "?";
 }
 
 } // namespace camel::test

@@ -109,6 +109,13 @@ Bytes tlv(uint8_t tag, const Bytes &content);
 // whose argument octets are `argumentHex`.
 Bytes invoke(uint8_t op, std::string_view argumentHex);
 
+// The decoded-field texts from the first field with id `fieldId` on (none
+// when there is no such field).
+std::vector<std::string> textsFrom(const Decoded &d, uint32_t fieldId);
+
+// The display text of the first field with id `fieldId` ("?" when none).
+std::string shownOf(const Decoded &d, uint32_t fieldId);
+
 // The decoded-field texts after the first field with id `fieldId` (
 // none when there is no such field).
 std::vector<std::string> textsAfter(const Decoded &d, uint32_t fieldId);

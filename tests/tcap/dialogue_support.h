@@ -38,17 +38,6 @@ inline Bytes begin(const Bytes &portions) {
     return tlv(0x62, cat({hexBytes("48 04 01 02 03 04"), portions}));
 }
 
-// The decoded-field texts from the first field with `id` on.
-inline std::vector<std::string> textsFrom(const Decoded &d, uint32_t id) {
-    std::vector<std::string> out;
-    bool on = false;
-    for (const Field &f : d.fields) {
-        on = on || f.id == id;
-        if (on)
-            out.push_back(f.text);
-    }
-    return out;
-}
 
 inline size_t countId(const Decoded &d, uint32_t id) {
     size_t n = 0;
