@@ -1,16 +1,13 @@
 // Mobile identities, location and time: IMSI digit counts and key, the
 // MCC-MNC forms, time and time zone, location information with every
-// member, subscriber state alternatives, the Initial DP argument extension,
-// timers, and the announcement flags and collect info run as units.
+// member, and the subscriber state alternatives.  (The values of the other
+// mobile elements are compared with tshark by the reference comparison.)
 #include <gtest/gtest.h>
 
 #include <cstdio>
 #include <string>
 #include <vector>
 
-#include "cap/units.h"
-#include "dpx_standin_host.h"
-#include "engine/scratch.h"
 #include "support/harness.h"
 
 namespace camel::test {
@@ -247,98 +244,6 @@ TEST(MobileSubscriberState, AlternativeChosenByItsIdentifier) {
         texts.insert(texts.end(), c.texts.begin(), c.texts.end());
         expectTexts(tlv("BF 33", c.content), 2110, texts, c.flags);
     }
-}
-
-// ---- Units the operation tables do not reach yet, run from their length on ----
-
-using UnitFn = int (*)(DecodeState *, ElementContext *, PreDecodeRequest *);
-
-struct UnitRun {
-    Texts texts, shown;
-    std::vector<uint32_t> displayIds;
-    uint32_t flags = 0;
-};
-
-template <Pass P>
-PassEnd runPass(UnitFn unit, const Bytes &m, UnitRun *run) {
-    DecodeState *st = host_NewState(m.data(), static_cast<uint32_t>(m.size()));
-    PreDecodeRequest rq;
-    host_InitRequest(&rq, st, 4, 4);
-    g_scratch<P> = Scratch{};
-    host_ClearRecords();
-    ElementContext ctx{0, 1, 0, 0};
-    PassEnd end;
-    end.result = unit(st, &ctx, &rq);
-    end.errorFlags = st->errorFlags;
-    end.cursor = st->bitCursor;
-    end.remainingBits = st->remainingBits;
-    for (uint32_t i = 0; P == Pass::Decoded && i < host_DecodedCount(); ++i)
-        run->texts.push_back(host_Decoded(i)->text);
-    for (uint32_t i = 0; P == Pass::Display && i < host_DisplayCount(); ++i) {
-        run->shown.push_back(host_Display(i)->text);
-        run->displayIds.push_back(host_Display(i)->displayId);
-    }
-    host_ClearRecords();
-    host_FreeRequest(&rq);
-    host_FreeState(st);
-    return end;
-}
-
-UnitRun runUnit(UnitFn decoded, UnitFn display, const std::string &hex) {
-    UnitRun run;
-    const Bytes m = hexBytes(hex);
-    const PassEnd md = runPass<Pass::Decoded>(decoded, m, &run);
-    const PassEnd to = runPass<Pass::Display>(display, m, &run);
-    EXPECT_EQ(md.result, 1);
-    EXPECT_EQ(to.result, 1);
-    EXPECT_EQ(to.errorFlags, md.errorFlags);
-    EXPECT_EQ(to.cursor, md.cursor);
-    EXPECT_EQ(run.shown.size(), run.texts.size());
-    run.flags = md.errorFlags;
-    return run;
-}
-#define MOBILE_UNIT(unit) &unit<Pass::Decoded>, &unit<Pass::Display>
-
-TEST(MobileUnits, AnnouncementFlagsAndCollectInfo) {
-    const struct {
-        UnitFn decoded, display;
-        std::string hex;
-        Texts texts;
-        uint32_t flags;
-    } cases[] = {
-        {MOBILE_UNIT(decodeDisconnectFromIpForbidden), "01 02",
-         {"  LENGTH=1 octet(s)", "  Disconnect Forbidden Value=True"}, 0},
-        {MOBILE_UNIT(decodeRequestAnnounceComplete), "01 00",
-         {"  LENGTH=1 octet(s)", "  Request Announce Value=False"}, 0},
-        {MOBILE_UNIT(decodeRequestAnnouncementStartedNotification), "01 FF",
-         {"  LENGTH=1 octet(s)", "  Boolean Value=True"}, 0},
-        {MOBILE_UNIT(decodeCollectInfo),
-         "15 A0 13 80 01 04 81 01 0A 82 02 12 3F 87 01 02 88 01 00 8A 01 05",
-         {"  LENGTH=21 octet(s)", "  Choice=Collected Digits", "  LENGTH=19 octet(s)",
-          "  Minimum Number Of Digits Tag=80", "  LENGTH=1 octet(s)", "  Number Of Digits=4",
-          "Maximum Number Of Digits Tag=81", "  LENGTH=1 octet(s)", "  Number Of Digits=10",
-          "End Of Reply Digit Tag=82", "  LENGTH=2 octet(s)", "  End Of Reply Digit Value=123f",
-          "Error Treatment Tag=87", "  LENGTH=1 octet(s)", "  Error Treatment Value=Repeat Prompt",
-          "  Interruptable Ann Ind Tag=88", "  LENGTH=1 octet(s)", "  Interruptable Ann Ind Value=False",
-          "  Voice Back Tag=8a", "  LENGTH=1 octet(s)", "  Voice Back Value=True"},
-         0},
-        // An alternative without a name is shown empty and not decoded.
-        {MOBILE_UNIT(decodeCollectInfo), "03 A1 01 00", {"  LENGTH=3 octet(s)", "  Choice="}, DPX_ERR_LEFTOVER},
-        // Members after a later one are left over.
-        {MOBILE_UNIT(decodeCollectInfo), "08 A0 06 81 01 0A 80 01 04",
-         {"  LENGTH=8 octet(s)", "  Choice=Collected Digits", "  LENGTH=6 octet(s)", "Maximum Number Of Digits Tag=81",
-          "  LENGTH=1 octet(s)", "  Number Of Digits=10"},
-         DPX_ERR_LEFTOVER},
-    };
-    for (const auto &c : cases) {
-        SCOPED_TRACE(c.hex);
-        const UnitRun run = runUnit(c.decoded, c.display, c.hex);
-        EXPECT_EQ(run.texts, c.texts);
-        EXPECT_EQ(run.flags, c.flags);
-    }
-    const UnitRun collect = runUnit(MOBILE_UNIT(decodeCollectInfo), "05 A0 03 80 01 04");
-    EXPECT_EQ(collect.shown, (Texts{"5 octet(s)", "Collected Digits", "3 octet(s)", "80", "1 octet(s)", "4"}));
-    EXPECT_EQ(collect.displayIds[0], 3606u); // every "LENGTH"
 }
 
 } // namespace

@@ -187,25 +187,6 @@ TEST(PartyNumbers, IsupParameters) {
     EXPECT_EQ(cause.key(8)->value, Bytes{0x01});
 }
 
-TEST(PartyNumbers, HighLayerCompatibility) {
-    const Case cases[] = {
-        {"ITU-T coding", kInitialDp, "97 02 91 E3", 1671,
-         {"High Layer Compatibility Tag=97", "  LENGTH=2 octet(s)", "  Coding Standard=CCITT Standard",
-          "  Interpretation=First High Layer Character", "  Presentation Method=High Layer Protocol Profile",
-          "  High Layer Charac Identification=Reserved For Audiovisual(63h)",
-          "  Extension Indicator=No Extension"}},
-        // Any other coding standard: the national part, then octet 4a.
-        {"national coding, octet 4a", kInitialDp, "97 03 B1 41 A1", 1671,
-         {"High Layer Compatibility Tag=97", "  LENGTH=3 octet(s)", "  Coding Standard=",
-          "  Interpretation=First High Layer Character", "  Presentation Method=High Layer Protocol Profile",
-          "  Etsi High Layer Char Identi=Eurofile Transfer", "  Extension Indicator=Extension",
-          "  Extended High Layer=Ini Cha 3.1khz Audio Or Speech"}},
-    };
-    for (const auto &c : cases)
-        check(c);
-    EXPECT_EQ(shownOf(decode(invoke(kInitialDp, "97 02 91 E3")), 1676), "High Layer Protocolprofile");
-}
-
 TEST(PartyNumbers, BearerCapability) {
     const Texts speechHead = {"Bearer Capability Tag=bb", "  LENGTH=5 octet(s)", "Choice=Bearer Cap TAG",
                               "  LENGTH=3 octet(s)"};
