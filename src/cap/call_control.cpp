@@ -19,17 +19,6 @@ namespace {
 
 // ---- Building blocks -----------------------------------------------------------
 
-// The row of a type decoded from its own length field on.
-consteval Member body(const char *name, uint32_t lengthId, Value value) {
-    return alt(0, name, lengthId, value);
-}
-
-template <Pass P>
-int decodeBody(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Member &row) {
-    if (ctx->present == 0)
-        return 1;
-    return decodeMember<P>(st, ctx, rq, row, 0);
-}
 
 // A row value decoded by the static member template `U::run<P>`: lets one
 // hand-written piece, parameterised by field ids, serve several rows.
@@ -379,16 +368,6 @@ constexpr Member kEventSpecificInfoBcsm =
 
 // ---- The units ------------------------------------------------------------------------------
 
-// A unit decoded by `decode` (decodeBody for a body row from its length
-// field on, walkTable for a table walked after the length) over `what`.
-#define CAMEL_TYPE_UNIT(unit, decode, what)                                                \
-    template <Pass P>                                                                      \
-    int unit(DecodeState *st, ElementContext *ctx, Request<P> *rq) {                       \
-        return decode<P>(st, ctx, rq, what);                                               \
-    }                                                                                      \
-    CAMEL_INSTANTIATE_UNIT(unit, DecodeState *, ElementContext *)
-#define CAMEL_BODY_UNIT(unit, row) CAMEL_TYPE_UNIT(unit, decodeBody, row)
-#define CAMEL_TABLE_UNIT(unit, table) CAMEL_TYPE_UNIT(unit, walkTable, table)
 
 CAMEL_BODY_UNIT(decodeExtensions, kExtensions);
 CAMEL_BODY_UNIT(decodeSendingSideId, kSendingSideId);

@@ -130,7 +130,7 @@ constexpr Member kExtensionContainerBody =
 
 template <Pass P>
 int decodeExtensionContainer(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-    return elementBody<P>(st, ctx, rq, kExtensionContainerBody);
+    return decodeBody<P>(st, ctx, rq, kExtensionContainerBody);
 }
 CAMEL_INSTANTIATE_UNIT(decodeExtensionContainer, DecodeState *, ElementContext *);
 

@@ -128,16 +128,7 @@ CAMEL_BODY_UNIT(decodeTimerValue, kTimerValue);
 CAMEL_BODY_UNIT(decodeCollectInfo, kCollectInfo);
 
 // Units called right after their element's length field.
-template <Pass P>
-int decodeSubscriberState(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-    return walkTable<P>(st, ctx, rq, kSubscriberStateChoice);
-}
-CAMEL_INSTANTIATE_UNIT(decodeSubscriberState, DecodeState *, ElementContext *);
-
-template <Pass P>
-int decodeInitialDpArgExtension(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-    return walkTable<P>(st, ctx, rq, kInitialDpArgExtensionLoop);
-}
-CAMEL_INSTANTIATE_UNIT(decodeInitialDpArgExtension, DecodeState *, ElementContext *);
+CAMEL_TABLE_UNIT(decodeSubscriberState, kSubscriberStateChoice);
+CAMEL_TABLE_UNIT(decodeInitialDpArgExtension, kInitialDpArgExtensionLoop);
 
 } // namespace camel

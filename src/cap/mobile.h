@@ -8,17 +8,6 @@
 
 namespace camel {
 
-// A unit that starts at its own length field is the element body of a row
-// without identifier: decodeMember opens the body's window from the length
-// at the cursor, shows the length field and decodes the row's value.
-consteval Member body(const char *name, uint32_t lengthId, Value value) {
-    return alt(0, name, lengthId, value);
-}
-template <Pass P>
-inline int elementBody(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Member &body) {
-    return decodeMember<P>(st, ctx, rq, body, 0);
-}
-
 // Fixed-size values: when the window holds fewer bits than the field, the
 // field is absent and the rest of the element is skipped.
 inline void needBits(DecodeState *st, ElementContext *ctx, uint32_t bits) {
@@ -56,13 +45,5 @@ int mccMncBlock(DecodeState *st, ElementContext *ctx, Request<P> *rq, const MccM
 // Extension Container, from its length field on.
 template <Pass P>
 int decodeExtensionContainer(DecodeState *st, ElementContext *ctx, Request<P> *rq);
-
-// A unit made of one body row: `unit` starts at its length field.
-#define CAMEL_BODY_UNIT(unit, bodyRow)                                                        \
-    template <Pass P>                                                                       \
-    int unit(DecodeState *st, ElementContext *ctx, Request<P> *rq) {                        \
-        return elementBody<P>(st, ctx, rq, bodyRow);                                        \
-    }                                                                                       \
-    CAMEL_INSTANTIATE_UNIT(unit, DecodeState *, ElementContext *)
 
 } // namespace camel

@@ -149,6 +149,13 @@ consteval MemberTable members(Walk walk, const Member (&rows)[N], uint32_t choic
                        choiceId != 0 ? fx(choiceId) : kNoField};
 }
 
+// A type whose unit starts at its own length field is the body of a row
+// without identifier: decodeMember opens the body's window from the length
+// at the cursor, shows the length field and decodes the row's value.
+consteval Member body(const char *name, uint32_t lengthId, Value value) {
+    return alt(0, name, lengthId, value);
+}
+
 // ---- Walking ----------------------------------------------------------------------
 
 // Walks table `t` in the current window with the caller's context.
@@ -170,5 +177,24 @@ int decodeMember(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Mem
 template <Pass P>
 int decodeRow(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Member &m,
               bool mandatory);
+
+// Decodes the body row `row` (see body()) from the length field at the cursor.
+template <Pass P>
+inline int decodeBody(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Member &row) {
+    if (ctx->present == 0)
+        return 1;
+    return decodeMember<P>(st, ctx, rq, row, 0);
+}
+
+// A type unit that is one body row (it starts at its length field) or one
+// table (walked right after its length field), stamped out for every pass.
+#define CAMEL_TYPE_UNIT_(unit, decode, what)                                                 \
+    template <Pass P>                                                                       \
+    int unit(DecodeState *st, ElementContext *ctx, Request<P> *rq) {                        \
+        return decode<P>(st, ctx, rq, what);                                                \
+    }                                                                                       \
+    CAMEL_INSTANTIATE_UNIT(unit, DecodeState *, ElementContext *)
+#define CAMEL_BODY_UNIT(unit, row) CAMEL_TYPE_UNIT_(unit, ::camel::decodeBody, row)
+#define CAMEL_TABLE_UNIT(unit, table) CAMEL_TYPE_UNIT_(unit, ::camel::walkTable, table)
 
 } // namespace camel
