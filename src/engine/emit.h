@@ -32,22 +32,22 @@ inline void noteStatus(const DecodeState *st, Request<P> *rq) {
 }
 
 // Reset the field record and copy the field's label into it.
+constexpr bool labelsFitTheHostBuffer() {
+    for (size_t i = 0; i < kFieldCount; ++i)
+        if (kLabelLengths.n[i] >= DPX_TEXT_BUFFER_SIZE)
+            return false;
+    return true;
+}
+static_assert(labelsFitTheHostBuffer(), "a label is longer than the host's label buffer");
+
 inline void beginField(DecodeState *st, FieldIndex f) {
     ResetFieldRecord(&st->field);
-    const char *label = kFields[f].label;
-    if (st->field.label != nullptr) {
-        size_t n = std::strlen(label);
-        if (n > DPX_TEXT_BUFFER_SIZE - 1)
-            n = DPX_TEXT_BUFFER_SIZE - 1;
-        std::memcpy(st->field.label, label, n);
-        st->field.label[n] = '\0';
-    }
+    if (st->field.label != nullptr)
+        std::memcpy(st->field.label, kFields[f].label, kLabelLengths.n[f] + 1u);
 }
 
 template <uint32_t Id>
 inline void beginField(DecodeState *st) {
-    static_assert(std::char_traits<char>::length(Field<Id>::def.label) < DPX_TEXT_BUFFER_SIZE,
-                  "label longer than the host's label buffer");
     beginField(st, Field<Id>::index);
 }
 

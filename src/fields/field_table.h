@@ -1159,6 +1159,19 @@ constexpr DisplayIds computeDisplayIds() {
 }
 inline constexpr DisplayIds kDisplayIds = computeDisplayIds();
 
+// The length of every label (the emission copies it once per field).
+struct LabelLengths {
+    uint16_t n[kFieldCount];
+};
+constexpr LabelLengths computeLabelLengths() {
+    LabelLengths out{};
+    for (size_t i = 0; i < kFieldCount; ++i)
+        while (kFields[i].label[out.n[i]] != '\0')
+            ++out.n[i];
+    return out;
+}
+inline constexpr LabelLengths kLabelLengths = computeLabelLengths();
+
 constexpr uint32_t displayIdOf(uint32_t id) { return kDisplayIds.id[fieldIndex(id)]; }
 
 namespace detail {
