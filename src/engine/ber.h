@@ -1,6 +1,7 @@
 // BER element conventions shared by every grammar unit: tag tests, element
 // windows, content blocks in their windowed and end-of-contents-delimited
-// forms, the end-of-contents unit, element loops, choices and repetitions.
+// forms, the end-of-contents unit and choices.  Element loops and
+// repetitions are walks of member tables (engine/members.h).
 #pragma once
 
 #include <cstdint>
@@ -259,47 +260,7 @@ inline int delimitedConstruct(DecodeState *st, ElementContext *ctx, Request<P> *
     return elementEnd<P>(st, rq);
 }
 
-// ---- Element loop ----------------------------------------------------------------
-
-// The members of an argument SEQUENCE, tried in sweeps until N consecutive
-// members miss, the window is used up or a sweep makes no progress.  A
-// member is a callable  int(ElementContext *ctx, bool &matched)  that tests
-// its tag, sets `matched` and, when it matched, decodes its element.
-template <Pass P, class... Members>
-inline int elementLoop(DecodeState *st, ElementContext *ctx, Request<P> *rq,
-                       Members &&...members) {
-    constexpr uint32_t n = sizeof...(Members);
-    st->occurrenceCounter = 0;
-    bool firstSweep = true;
-    uint32_t sweepStart = 0;
-    while (st->remainingBits != 0 && ctx->present != 0 && st->occurrenceCounter < n &&
-           (firstSweep || st->bitCursor != sweepStart)) {
-        firstSweep = false;
-        sweepStart = st->bitCursor;
-        bool ok = true;
-        auto tryMember = [&](auto &member) {
-            if (!ok || ctx->present == 0 || st->occurrenceCounter >= n)
-                return;
-            bool matched = false;
-            if (member(ctx, matched) == 0) {
-                ok = false;
-                return;
-            }
-            if (matched)
-                st->occurrenceCounter = 0;
-            else
-                ++st->occurrenceCounter;
-        };
-        (tryMember(members), ...);
-        if (!ok)
-            return 0;
-    }
-    st->occurrenceCounter = 0;
-    noteStatus<P>(st, rq);
-    return 1;
-}
-
-// ---- Choice and repetition -------------------------------------------------------
+// ---- Choice -----------------------------------------------------------------------
 
 // A "Choice" field: the alternative's identifier octet, reported by name
 // and kept in `choiceTag` for the selection that follows.
@@ -317,22 +278,6 @@ int choiceField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex
 template <Pass P, uint32_t Id>
 inline int choiceField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     return choiceField<P>(st, ctx, rq, Field<Id>::index);
-}
-
-// SEQUENCE OF at argument level: items while the next identifier is
-// `itemTag`, at most 255.  `item` is a callable  int(ElementContext *ctx).
-template <Pass P, class Item>
-inline int repeatItems(DecodeState *st, ElementContext *ctx, Request<P> *rq, uint32_t itemTag,
-                       Item &&item) {
-    uint32_t count = 0;
-    while (ctx->present != 0 && count < 255 && tagTest(st, itemTag)) {
-        ++count;
-        ++ctx->occurrenceCount;
-        if (item(ctx) == 0)
-            return 0;
-    }
-    noteStatus<P>(st, rq);
-    return 1;
 }
 
 } // namespace camel

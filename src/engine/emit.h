@@ -264,13 +264,6 @@ int classNumberTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq, Fi
     return finishField<P>(st, rq, f, 8);
 }
 
-// A two-octet tag field (tag numbers above 30): the 16 bits read as one
-// value, first octet in the low byte.
-template <Pass P>
-int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
-    return fittedBitsField<P>(st, ctx, rq, f, 0, 16, 16);
-}
-
 // The general BER length field (short, long or indefinite form): one span
 // over all length octets, value to `lengthValue`.  A length whose octets
 // are not all in the window is treated like any field that does not fit,
@@ -395,10 +388,6 @@ inline int octetField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
 template <Pass P, uint32_t Id>
 inline int classNumberTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
     return classNumberTagField<P>(st, ctx, rq, Field<Id>::index);
-}
-template <Pass P, uint32_t Id>
-inline int twoOctetTagField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-    return twoOctetTagField<P>(st, ctx, rq, Field<Id>::index);
 }
 template <Pass P, uint32_t Id>
 inline int lengthField(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
