@@ -973,6 +973,11 @@ inline constexpr FieldDef kFields[] = {
     argLength(1265),
     enumField(1238, "SpecializedResourceReportArg Choice", names::kSpecializedResourceReport, 16),
     argLength(1240),
+    // ---- SMS operations (62, 65, 64, 61, 60, 66, 63, 67) ----
+
+    // ---- GPRS operations (70 to 83) ----
+
+    // ---- Call-control operations of CAP v4 (86, 32, 88, 90, 93, 95, 96, 97) ----
     tagField(4140, "DisconnectForwardConnectionWithArgumentArg Tag"),
     argLength(4141),
     argLength(4180),
