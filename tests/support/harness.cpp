@@ -1,5 +1,6 @@
 #include "support/harness.h"
 
+#include "engine/members.h"
 #include "fields/field_table.h"
 
 #include "../../tools/dpx-decode/key_layout.h"
@@ -129,9 +130,41 @@ struct PreRequest {
     PreRequest &operator=(const PreRequest &) = delete;
 };
 
-} // namespace
+// The passes as a host runs them, through the entry points.
+struct EntryPoints {
+    int md(PreDecodeRequest *rq) const { return dpx_PreDecodeMD(rq); }
+    int display(PreDecodeRequest *rq) const { return dpx_PreDecodeTO(rq); }
+    int view(PreDecodeRequest *rq) const { return dpx_PreDecodeMV(rq); }
+    int keys(KeyFieldRequest *rq) const { return KFE_3gpp_camel_400(rq); }
+};
 
-KeyRun runKeys(const Bytes &message, uint16_t room) {
+// A member table walked in each pass, inside a window of `windowBits` bits
+// from the message's start when it is not 0.
+struct TableWalk {
+    const MemberTable &table;
+    uint32_t windowBits;
+    template <Pass P>
+    int run(Request<P> *rq) const {
+        DecodeState *st = rq->state;
+        g_scratch<P> = Scratch{};
+        if (windowBits != 0) {
+            st->remainingBits = windowBits;
+            if (!pushEnd(st))
+                return 0;
+        }
+        ElementContext ctx{0, 1, 0, 0};
+        const int result = walkTable<P>(st, &ctx, rq, table);
+        rq->remainingBits = st->remainingBits; // as an entry point hands them back
+        return result;
+    }
+    int md(PreDecodeRequest *rq) const { return run<Pass::Decoded>(rq); }
+    int display(PreDecodeRequest *rq) const { return run<Pass::Display>(rq); }
+    int view(PreDecodeRequest *rq) const { return run<Pass::MessageView>(rq); }
+    int keys(KeyFieldRequest *rq) const { return run<Pass::KeyField>(rq); }
+};
+
+template <class Passes>
+KeyRun runKeysWith(const Bytes &message, uint16_t room, const Passes &passes) {
     State s(message);
     KeyRun run{0, {}, Bytes(kKeyBufferSize, 0), 0, {}};
     KeyFieldRequest rq{};
@@ -139,20 +172,23 @@ KeyRun runKeys(const Bytes &message, uint16_t room) {
     rq.dataOffset = HOST_KEY_DATA_START;
     rq.valueRoom = room;
     rq.state = s.st;
-    run.result = KFE_3gpp_camel_400(&rq);
+    run.result = passes.keys(&rq);
     run.end = endOf(run.result, s.st);
     run.dataOffset = rq.dataOffset;
     run.entries = readKeys(run.buffer);
     return run;
 }
 
-Decoded decode(const Bytes &message) {
+// All four passes, each on a freshly prepared state, and the cross-pass
+// invariant.
+template <class Passes>
+Decoded decodeWith(const Bytes &message, const Passes &passes) {
     Decoded d;
     host_ClearRecords();
     {
         State s(message);
         PreRequest r(s.st);
-        d.md = endOf(dpx_PreDecodeMD(&r.rq), s.st);
+        d.md = endOf(passes.md(&r.rq), s.st);
         d.layer = r.rq.layerEntries[0];
         EXPECT_EQ(r.rq.remainingBits, s.st->remainingBits);
         for (uint32_t i = 0; i < host_DecodedCount(); ++i) {
@@ -170,7 +206,7 @@ Decoded decode(const Bytes &message) {
     {
         State s(message);
         PreRequest r(s.st);
-        d.display = endOf(dpx_PreDecodeTO(&r.rq), s.st);
+        d.display = endOf(passes.display(&r.rq), s.st);
         for (uint32_t i = 0; i < host_DisplayCount(); ++i)
             d.shown.push_back({host_Display(i)->displayId, host_Display(i)->text});
     }
@@ -178,12 +214,12 @@ Decoded decode(const Bytes &message) {
     {
         State s(message);
         PreRequest r(s.st);
-        d.view = endOf(dpx_PreDecodeMV(&r.rq), s.st);
+        d.view = endOf(passes.view(&r.rq), s.st);
         d.status = r.rq.status;
         EXPECT_EQ(r.rq.layerIndex, 0u) << "the message-view pass fills no layer entry";
     }
     {
-        KeyRun k = runKeys(message, static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START));
+        KeyRun k = runKeysWith(message, static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START), passes);
         d.keyEntries = std::move(k.entries);
         d.keys = k.end;
     }
@@ -216,6 +252,16 @@ Decoded decode(const Bytes &message) {
             << "display text '" << value << "' does not end the field text '" << text << "'";
     }
     return d;
+}
+
+} // namespace
+
+KeyRun runKeys(const Bytes &message, uint16_t room) { return runKeysWith(message, room, EntryPoints{}); }
+
+Decoded decode(const Bytes &message) { return decodeWith(message, EntryPoints{}); }
+
+Decoded walk(const Bytes &message, const MemberTable &table, uint32_t windowBits) {
+    return decodeWith(message, TableWalk{table, windowBits});
 }
 
 namespace {

@@ -10,6 +10,10 @@
 #include "dpx_camel.h"
 #include "dpx_standin_host.h"
 
+namespace camel {
+struct MemberTable;
+}
+
 namespace camel::test {
 
 using Bytes = std::vector<uint8_t>;
@@ -78,6 +82,13 @@ struct Decoded {
 // the flags.  Failures are reported through gtest.
 Decoded decode(const Bytes &message);
 inline Decoded decode(std::string_view hex) { return decode(hexBytes(hex)); }
+
+// Runs all four passes like decode(), but each pass walks the member table
+// `table` from the message's first octet (with the scratch values reset, as
+// an entry point resets them) instead of decoding a TCAP message; with
+// `windowBits` not 0 the walk runs inside a window of that many bits.  Lets
+// a type unit be tested before any argument carries it.
+Decoded walk(const Bytes &message, const MemberTable &table, uint32_t windowBits = 0);
 
 // Runs the key-field pass only, with a given key room; the key buffer is
 // returned so a test can look at the raw bytes.
