@@ -132,6 +132,11 @@ TEST(MsRadioAccessCapability, RecordsOfSeveralTechnologies) {
     }
 }
 
+TEST(MsRadioAccessCapability, EveryGrowthFailureEndsThePassWithZero) {
+    // Fields of several spans grow the span array past its first slot.
+    EXPECT_GT(checkReallocFailures(element("e5 60", kBodies[0].body), kElement), 8u);
+}
+
 TEST(MsRadioAccessCapability, FieldIdsFollowTheRecordSlots) {
     // The first record's fields carry their family ids, the second record's
     // the ids of the second slot; the header and the padding their own.

@@ -154,7 +154,8 @@ struct TableWalk {
         }
         ElementContext ctx{0, 1, 0, 0};
         const int result = walkTable<P>(st, &ctx, rq, table);
-        rq->remainingBits = st->remainingBits; // as an entry point hands them back
+        if (result == 1) // as an entry point hands them back
+            rq->remainingBits = st->remainingBits;
         return result;
     }
     int md(PreDecodeRequest *rq) const { return run<Pass::Decoded>(rq); }
@@ -290,7 +291,8 @@ enum class Which { MD, TO, MV, KF };
 
 // Runs one pass with pu_Realloc failing at call n; returns whether the
 // failure was reached.
-bool runFailing(const Bytes &message, Which which, uint32_t n) {
+template <class Passes>
+bool runFailing(const Bytes &message, const Passes &passes, Which which, uint32_t n) {
     State s(message);
     shrinkArrays(s.st);
     PreRequest r(s.st);
@@ -303,10 +305,10 @@ bool runFailing(const Bytes &message, Which which, uint32_t n) {
     host_SetReallocFailAt(n);
     int result = 0;
     switch (which) {
-    case Which::MD: result = dpx_PreDecodeMD(&r.rq); break;
-    case Which::TO: result = dpx_PreDecodeTO(&r.rq); break;
-    case Which::MV: result = dpx_PreDecodeMV(&r.rq); break;
-    case Which::KF: result = KFE_3gpp_camel_400(&kr); break;
+    case Which::MD: result = passes.md(&r.rq); break;
+    case Which::TO: result = passes.display(&r.rq); break;
+    case Which::MV: result = passes.view(&r.rq); break;
+    case Which::KF: result = passes.keys(&kr); break;
     }
     const bool reached = host_ReallocCalls() >= n;
     host_SetReallocFailAt(0);
@@ -328,18 +330,25 @@ bool runFailing(const Bytes &message, Which which, uint32_t n) {
     return reached;
 }
 
-} // namespace
-
-uint32_t checkReallocFailures(const Bytes &message) {
+template <class Passes>
+uint32_t checkReallocFailuresWith(const Bytes &message, const Passes &passes) {
     uint32_t points = 0;
     for (Which w : {Which::MD, Which::TO, Which::MV, Which::KF}) {
         for (uint32_t n = 1;; ++n) {
-            if (!runFailing(message, w, n))
+            if (!runFailing(message, passes, w, n))
                 break;
             ++points;
         }
     }
     return points;
+}
+
+} // namespace
+
+uint32_t checkReallocFailures(const Bytes &message) { return checkReallocFailuresWith(message, EntryPoints{}); }
+
+uint32_t checkReallocFailures(const Bytes &message, const MemberTable &table) {
+    return checkReallocFailuresWith(message, TableWalk{table, 0});
 }
 
 Bytes tlv(uint8_t tag, const Bytes &content) {

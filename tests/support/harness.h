@@ -107,6 +107,8 @@ KeyRun runKeys(const Bytes &message, uint16_t room);
 // array that failed, writes no layer entry end and does not advance the
 // layer index.  Returns the number of failure points exercised.
 uint32_t checkReallocFailures(const Bytes &message);
+// The same for a member table walked as walk() walks it.
+uint32_t checkReallocFailures(const Bytes &message, const MemberTable &table);
 
 // The decoded-field texts of a message joined by newlines.
 std::string textDump(const Decoded &d);
