@@ -3,6 +3,7 @@
 // DP argument extension, the announcement flags, the collected-information
 // request and the timers.  Location information is in location.cpp.
 #include "cap/mobile.h"
+#include "cap/rows.h"
 #include "cap/units.h"
 
 namespace camel {
@@ -60,12 +61,6 @@ constexpr Member kSubscriberState[] = {
 constexpr MemberTable kSubscriberStateChoice = members(Walk::FirstMatch, kSubscriberState);
 
 // ---- Initial DP Arg Extension -----------------------------------------------------------
-
-// An octet string member whose tag, length and value fields have
-// consecutive ids; its value takes all content octets.
-consteval Member octetString(uint32_t tag, const char *name, uint32_t tagId) {
-    return el(tag, name, tagId, tagId + 1, halfOctets(tagId + 2, 255));
-}
 
 constexpr Member kInitialDpArgExtension[] = {
     el(0x80, "ISDN Address String", 2149, 0, CAMEL_UNIT(decodeIsdnAddressString)),
