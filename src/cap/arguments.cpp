@@ -6,6 +6,7 @@
 
 #include "cap/arguments_sms.h"
 #include "cap/charging.h"
+#include "cap/mobile.h"
 #include "cap/rows.h"
 #include "cap/units.h"
 
@@ -247,7 +248,7 @@ constexpr Member kInitialDp[] = {
     calledPartyBcdNumber(0x9F38, 2137),
     timeAndTimezone(0x9F39, 2230),
     el(0x9F3A, "Gsm Forwarding Pending", 1194, 1195, none()),
-    el(0xBF3B, "Initial DP Arg Extension", 1196, 1197, CAMEL_UNIT(decodeInitialDpArgExtension)),
+    el(0xBF3B, "Initial DP Arg Extension", 1196, 1197, table(kInitialDpArgExtensionTable)),
 };
 constexpr MemberTable kInitialDpLoop = members(Walk::Loop, kInitialDp);
 constexpr Member kInitialDpArg[] = {sequence("Initial DP", 1159, 1160, kInitialDpLoop)};

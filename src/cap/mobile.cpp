@@ -75,7 +75,6 @@ constexpr Member kInitialDpArgExtension[] = {
     octetString(0x89, "Low Layer Compatibility", 4226),
     octetString(0x8A, "Low Layer Compatibility", 4226),
 };
-constexpr MemberTable kInitialDpArgExtensionLoop = members(Walk::Loop, kInitialDpArgExtension);
 
 // ---- Announcement flags and timers -----------------------------------------------------------
 
@@ -124,6 +123,7 @@ CAMEL_BODY_UNIT(decodeCollectInfo, kCollectInfo);
 
 // Units called right after their element's length field.
 CAMEL_TABLE_UNIT(decodeSubscriberState, kSubscriberStateChoice);
-CAMEL_TABLE_UNIT(decodeInitialDpArgExtension, kInitialDpArgExtensionLoop);
+
+constexpr MemberTable kInitialDpArgExtensionTable = members(Walk::Loop, kInitialDpArgExtension);
 
 } // namespace camel
