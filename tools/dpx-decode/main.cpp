@@ -18,8 +18,8 @@
 #include "hex_line.h"
 #include "input.h"
 #include "module.h"
-#include "output.h"
-#include "summary.h"
+#include "views/output.h"
+#include "views/summary.h"
 
 namespace {
 
