@@ -60,14 +60,14 @@ SMS_ADDRESS = cc.address_string
 EVENT_TYPE_SMS = one(1, 2, 3, 11, 12, 13, range(256))
 MESSAGE_TYPE = some(((1, '80', one(0, 1)),))
 # Elements of SMS Initial DP built elsewhere (location information GPRS [6],
-# GPRS MS class [18]): present in one message of ten, see the rule below.
+# GPRS MS class [18]): in about one message in thirteen, see the rule below.
 LOCATION_GPRS = some(((1, '80', cc.cell_id), (.5, '81', lambda rng: cc.plmn_lac(rng) + b'\x07')))
 GPRS_MS_CLASS = some(((1, '80', lambda rng: octets(rng, 2, 2)),
                       (.5, '81', lambda rng: octets(rng, 1, 6))))
 
 
 def initial_dp_sms(rng):
-    """SMS Initial DP; one message in ten also carries [6] or [18]."""
+    """SMS Initial DP; about one message in thirteen also carries [6] or [18]."""
     other = rng.random() < .1
     return some((
         (1, '80', cc.service_key), (.8, '81', cc.bcd_number), (.8, '82', SMS_ADDRESS),
