@@ -244,8 +244,8 @@ VALUES = (
 RULE_TEXT = dict(ch.RULE_TEXT, **{
     'gprs-elements-not-built-yet': 'SMS Initial DP with location information GPRS [6] or the '
                                    'GPRS MS class [18]: elements of the GPRS part, not decoded '
-                                   'yet; the element loop stops at them and the rest of the '
-                                   'argument is left over (flag 0x10): values not compared',
+                                   'yet; the element loop steps over them (flag 0x10) and '
+                                   'what tshark shows inside them is not compared',
 })
 # Rules inside the argument that leave octets unread, and their flags.
 FLAGGING_PAYLOAD_RULES = dict(ch.FLAGGING_PAYLOAD_RULES, **{'gprs-elements-not-built-yet': 0x10})
@@ -254,12 +254,13 @@ ROWS = [cc._row(r) for r in VALUES]
 
 
 def _gprs_elements(root):
-    """Whether the message's Invoke argument holds [6] or [18] (SMS Initial
-    DP's location information GPRS and GPRS MS class)."""
+    """(first, end) octets of the [6] and [18] elements (SMS Initial DP's
+    location information GPRS and GPRS MS class) in the message's Invoke
+    argument."""
     cp = root.kid(0x6C)
     if cp is None or not cp.kids or cp.kids[0].tag != 0xA1 or len(cp.kids[0].kids) < 3:
-        return False
-    return any(k.tag in (0xA6, 0xB2) for k in cp.kids[0].kids[-1].kids)
+        return []
+    return [(k.off, k.end) for k in cp.kids[0].kids[-1].kids if k.tag in (0xA6, 0xB2)]
 
 
 def payload(root, stats, hexmsg):
@@ -274,10 +275,12 @@ def payload(root, stats, hexmsg):
 
 def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
     """call_control.check over this module's corpus, payloads and values;
-    the values of a message under gprs-elements-not-built-yet are not
-    compared."""
-    pdml = [[] if _gprs_elements(parse_node(bytes.fromhex(h), 0)) else p
-            for (_, h), p in zip(corpus, pdml)]
+    what tshark shows inside the elements of gprs-elements-not-built-yet is
+    not compared."""
+    def outside(fields, hexmsg):
+        skipped = _gprs_elements(parse_node(bytes.fromhex(hexmsg), 0))
+        return [f for f in fields if not any(a <= f[3] < b for a, b in skipped)]
+    pdml = [outside(p, h) for (_, h), p in zip(corpus, pdml)]
     return cc.check(corpus, pdml, oracle, ours, parse_node, tcap_rules, payload,
                     lambda group: int(group.split('/')[0]), ROWS, FLAGGING_PAYLOAD_RULES)
 
