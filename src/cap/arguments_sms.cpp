@@ -6,6 +6,7 @@
 
 #include "cap/bit_fields.h"
 #include "cap/mobile.h"
+#include "cap/ms_capability.h"
 #include "cap/rows.h"
 #include "cap/units.h"
 
@@ -226,6 +227,7 @@ constexpr Member kInitialDpSms[] = {
     isdnAddressString(0x8F, 2155),
     isdnAddressString(0x90, 2156),
     octetString(0x91, "MS_Classmark2", 4216),
+    gprsmsClass(0xB2),
     octetString(0x93, "IMEI", 4219),
     isdnAddressString(0x94, 2157),
 };

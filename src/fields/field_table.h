@@ -1056,19 +1056,6 @@ inline constexpr FieldDef kFields[] = {
     digitsField(4177, "Call Reference Number Value").indented(),
     tagField(2155, "ISDN Address String Tag"),
     tagField(2156, "ISDN Address String Tag"),
-    tagField(2157, "ISDN Address String Tag"),
-    tagField(2288, "RP Cause Tag"),
-    argLength(2289),
-    enumField(2290, "RP Cause Value", names::sms::kRpCause, 7).indented().key(7, KeyForm::Octet),
-    tagField(2291, "Sequence Tag"),
-    argLength(2292),
-    tagField(2295, "SMS Events Tag"),
-    argLength(2296),
-    tagField(2298, "SMS Event Tag"),
-    argLength(2299),
-    tagField(2301, "Sequence Tag"),
-    argLength(2302),
-
     // ---- MS network and radio access capability ----
     tagField(2528, "Gprsms Class Tag"),
     argLength(2529),
@@ -1306,6 +1293,18 @@ inline constexpr FieldDef kFields[] = {
     mscap::spare(4126),
     mscap::selector(4127),
     mscap::spare(4128),
+    tagField(2157, "ISDN Address String Tag"),
+    tagField(2288, "RP Cause Tag"),
+    argLength(2289),
+    enumField(2290, "RP Cause Value", names::sms::kRpCause, 7).indented().key(7, KeyForm::Octet),
+    tagField(2291, "Sequence Tag"),
+    argLength(2292),
+    tagField(2295, "SMS Events Tag"),
+    argLength(2296),
+    tagField(2298, "SMS Event Tag"),
+    argLength(2299),
+    tagField(2301, "Sequence Tag"),
+    argLength(2302),
 
     // ---- GPRS operations (70 to 83) ----
 
