@@ -89,16 +89,28 @@ int main(int argc, char **argv) {
     bool summary = false;
     bool stats = false;
     bool ansi = false;
+    std::string fieldsMode = "values";
+    std::string timeFormat = "utc";
+    bool version = false;
 
     app.add_option("files", files, "files of hex messages or captures ('-' is standard input)");
     app.add_option("--hex", hexArgs, "a message in hex (repeatable)")->allow_extra_args(false);
-    auto *passOption = app.add_option("--pass", passNames, "passes to run: md, display, view, keys (default all)")
+    auto *passOption = app.add_option("--pass", passNames,
+                                      "passes to run and show: md, display, view, keys (default: md in text, all "
+                                      "four in json)")
                            ->delimiter(',')
                            ->check(CLI::IsMember({"md", "display", "view", "keys"}))
                            ->allow_extra_args(false);
-    app.add_option("--format", format, "output format: text or json")
-        ->check(CLI::IsMember({"text", "json"}));
+    app.add_option("--format", format, "output format: text, json or ek (bulk-index actions and documents)")
+        ->check(CLI::IsMember({"text", "json", "ek"}));
+    app.add_option("--fields", fieldsMode,
+                   "text output: values (nested, tags and lengths folded; default), all (nested, every field) "
+                   "or list (flat, as reported)")
+        ->check(CLI::IsMember({"values", "all", "list"}));
+    app.add_option("--time", timeFormat, "capture times in text: utc (ISO 8601, default), epoch or relative")
+        ->check(CLI::IsMember({"utc", "epoch", "relative"}));
     app.add_flag("--spans", spans, "text output: append each field's bit ranges [first-last]=value");
+    app.add_flag("--version", version, "print the module's version and interface version, and exit");
     app.add_option("--module", modulePath,
                    "decoder module to load (default: 3gpp_camel_400_DLL.so beside dpx-decode)");
     app.add_option("--ssn", ssnList,
@@ -134,23 +146,43 @@ int main(int argc, char **argv) {
         std::cerr << "dpx-decode: cannot load module: " << error << '\n';
         return kExitNoModule;
     }
+    if (version) {
+        const void *interfaceVersion = nullptr;
+        const bool served = module.getPtr(1, &interfaceVersion) == 0 && interfaceVersion != nullptr;
+        std::cout << "dpx-decode " DPX_VERSION "\nmodule " << modulePath << "\ninterface version "
+                  << (served ? static_cast<const char *>(interfaceVersion) : "(not served)") << '\n';
+        return served ? 0 : kExitNoModule;
+    }
 
     std::ios::sync_with_stdio(false);
     static char outBuffer[1 << 16];
     std::cout.rdbuf()->pubsetbuf(outBuffer, sizeof outBuffer);
 
-    // The summary and the statistics are made from the decoded-field pass:
-    // it runs for them even when its output is not wanted.
-    dpxdecode::PassSelection passes = selectPasses(passNames);
-    if (summary && passOption->count() == 0)
-        passes = dpxdecode::PassSelection{false, false, false, false};
-    const bool showMd = passes.md;
-    const bool passOutput = !summary || passOption->count() > 0;
-    dpxdecode::PassSelection run = passes;
-    run.md |= summary || stats;
-
+    // What is shown: the readable fields in text, every pass in JSON, the
+    // passes named with --pass.  The summary, the statistics and the
+    // bulk-index documents are made from the decoded-field and key-field
+    // passes: those run for them even when their output is not wanted.
     const bool json = format == "json";
-    const dpxdecode::TextOptions textOptions{spans};
+    const bool ek = format == "ek";
+    const bool named = passOption->count() > 0;
+    dpxdecode::PassSelection passes = selectPasses(passNames);
+    if (!named && !json)
+        passes = dpxdecode::PassSelection{!summary && !ek, false, false, false};
+    const bool showMd = passes.md;
+    const bool passOutput = !ek && (!summary || named);
+    dpxdecode::PassSelection run = passes;
+    run.md |= summary || stats || ek;
+    run.keys |= ek;
+
+    dpxdecode::TimeFormatter time(timeFormat == "epoch"      ? dpxdecode::TimeFormat::Epoch
+                                  : timeFormat == "relative" ? dpxdecode::TimeFormat::Relative
+                                                             : dpxdecode::TimeFormat::Utc,
+                                  module.dateConv);
+    const dpxdecode::TextOptions textOptions{spans,
+                                             fieldsMode == "all"    ? dpxdecode::FieldsMode::All
+                                             : fieldsMode == "list" ? dpxdecode::FieldsMode::List
+                                                                    : dpxdecode::FieldsMode::Values,
+                                             &time};
     uint64_t index = 0;
     dpxdecode::Session session(module);
     if (!session.ok()) {
