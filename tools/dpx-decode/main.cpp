@@ -201,9 +201,9 @@ int main(int argc, char **argv) {
             if (summary || stats) {
                 dpxdecode::summarize(*result.md, messageSummary);
                 if (stats)
-                    statistics.add(messageSummary, result.md->errorFlags);
+                    statistics.add(messageSummary);
                 if (summary)
-                    dpxdecode::writeSummary(std::cout, index, msg.capture, messageSummary);
+                    dpxdecode::writeSummary(std::cout, index, msg.capture, messageSummary, time, json);
             }
             if (passOutput) {
                 // The decoded fields made only for the summary or the

@@ -261,6 +261,15 @@ void writeOrigin(Text &os, const CaptureOrigin &origin, TimeFormatter *time) {
     };
     ssn(", called SSN ", c.hasCalledSsn, c.calledSsn);
     ssn(", calling SSN ", c.hasCallingSsn, c.callingSsn);
+    const auto gt = [&os](const char *what, const capture::GlobalTitle &g) {
+        os << what;
+        if (g.size == 0)
+            os << '-';
+        else
+            os << std::string_view(g.digits, g.size);
+    };
+    gt(", called GT ", c.calledGt);
+    gt(", calling GT ", c.callingGt);
     os << '\n';
 }
 
