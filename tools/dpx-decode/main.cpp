@@ -18,6 +18,7 @@
 #include "hex_line.h"
 #include "input.h"
 #include "module.h"
+#include "views/ek_output.h"
 #include "views/output.h"
 #include "views/summary.h"
 
@@ -132,6 +133,10 @@ int main(int argc, char **argv) {
         return kExitUsage;
     }
     inputOptions.progress = isatty(STDERR_FILENO) == 1;
+    if (format == "ek" && (summary || stats || passOption->count() > 0)) {
+        std::cerr << "dpx-decode: --format ek writes bulk-index documents only: no --summary, --stats or --pass\n";
+        return kExitUsage;
+    }
 
     if (modulePath.empty()) {
         modulePath = dpxdecode::defaultModulePath();
@@ -198,8 +203,11 @@ int main(int argc, char **argv) {
         hexArgs, files, inputOptions,
         [&](const dpxdecode::InputMessage &msg) {
             session.run(msg.bytes.data(), msg.bytes.size(), run, result);
-            if (summary || stats) {
+            if (summary || stats || ek) {
                 dpxdecode::summarize(*result.md, messageSummary);
+                if (ek)
+                    dpxdecode::writeEk(std::cout, msg, index, dpxdecode::toHex(msg.bytes), result, messageSummary,
+                                       time);
                 if (stats)
                     statistics.add(messageSummary);
                 if (summary)

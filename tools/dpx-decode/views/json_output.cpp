@@ -1,72 +1,16 @@
-// JSON output written straight into a buffer: the same text nlohmann's
-// compact dump gives (members in order, no blanks), without building a
-// document per message.
-#include <nlohmann/json.hpp>
-
+// JSON output written straight into a buffer, without building a document
+// per message.
 #include <ostream>
 #include <string>
 
+#include "json_writer.h"
 #include "key_text.h"
 #include "output.h"
 
 namespace dpxdecode {
 namespace {
 
-class Writer {
-public:
-    explicit Writer(std::string &out) : out_(out) {}
-
-    Writer &raw(const char *s) {
-        out_ += s;
-        return *this;
-    }
-    Writer &number(uint64_t v) {
-        char buf[24];
-        char *p = buf + sizeof buf;
-        do {
-            *--p = char('0' + v % 10);
-            v /= 10;
-        } while (v != 0);
-        out_.append(p, size_t(buf + sizeof buf - p));
-        return *this;
-    }
-    Writer &number(int64_t v) {
-        if (v < 0) {
-            out_ += '-';
-            return number(uint64_t(0) - uint64_t(v));
-        }
-        return number(uint64_t(v));
-    }
-    Writer &number(uint32_t v) { return number(uint64_t(v)); }
-    Writer &number(int32_t v) { return number(int64_t(v)); }
-
-    // Plain printable ASCII is copied; anything else (escapes, UTF-8, bytes
-    // that are not UTF-8) goes through nlohmann's serializer so the
-    // escaping and the U+FFFD replacement stay exactly its own.
-    Writer &string(std::string_view s) {
-        for (const char c : s) {
-            const auto u = static_cast<unsigned char>(c);
-            if (u < 0x20 || u >= 0x7F || c == '"' || c == '\\') {
-                out_ += nlohmann::json(std::string(s))
-                            .dump(-1, ' ', false, nlohmann::json::error_handler_t::replace);
-                return *this;
-            }
-        }
-        out_ += '"';
-        out_ += s;
-        out_ += '"';
-        return *this;
-    }
-    Writer &key(const char *name) {
-        out_ += '"';
-        out_ += name;
-        out_ += "\":";
-        return *this;
-    }
-
-private:
-    std::string &out_;
-};
+using Writer = JsonWriter;
 
 void common(Writer &w, const PassOutcome &p) {
     w.raw("{").key("result").number(p.result).raw(",").key("remainingBits").number(p.remainingBits);
