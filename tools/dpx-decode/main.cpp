@@ -97,10 +97,10 @@ int main(int argc, char **argv) {
     app.add_option("files", files, "files of hex messages or captures ('-' is standard input)");
     app.add_option("--hex", hexArgs, "a message in hex (repeatable)")->allow_extra_args(false);
     auto *passOption = app.add_option("--pass", passNames,
-                                      "passes to run and show: md, display, view, keys (default: md in text, all "
-                                      "four in json)")
+                                      "passes to run and show: md, display, view, keys or none (default: md in "
+                                      "text, all four in json)")
                            ->delimiter(',')
-                           ->check(CLI::IsMember({"md", "display", "view", "keys"}))
+                           ->check(CLI::IsMember({"md", "display", "view", "keys", "none"}))
                            ->allow_extra_args(false);
     app.add_option("--format", format, "output format: text, json or ek (bulk-index actions and documents)")
         ->check(CLI::IsMember({"text", "json", "ek"}));
@@ -174,7 +174,7 @@ int main(int argc, char **argv) {
     if (!named && !json)
         passes = dpxdecode::PassSelection{!summary && !ek, false, false, false};
     const bool showMd = passes.md;
-    const bool passOutput = !ek && (!summary || named);
+    const bool passOutput = !ek && (!summary || named) && (passes.md || passes.display || passes.view || passes.keys);
     dpxdecode::PassSelection run = passes;
     run.md |= summary || stats || ek;
     run.keys |= ek;
