@@ -109,7 +109,8 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
 }
 
 TEST(DpxDecodeRun, TextShowsFieldLinesVerdictAndKeys) {
-    const Outcome r = run("--hex 6206480401020304 --hex '62 06 49 04 01 02 03 04'");
+    const Outcome r =
+        run("--fields list --pass md,display,view,keys --hex 6206480401020304 --hex '62 06 49 04 01 02 03 04'");
     ASSERT_EQ(r.status, 0) << r.err;
     const Lines lines = r.lines();
     ASSERT_GE(lines.size(), 14u);
@@ -122,7 +123,7 @@ TEST(DpxDecodeRun, TextShowsFieldLinesVerdictAndKeys) {
     EXPECT_NE(r.out.find("view: invalid: mandatory element missing, left-over bits skipped\n"),
               std::string::npos) << r.out;
 
-    const Lines spans = run("--spans --pass md --hex 6206480401020304").lines();
+    const Lines spans = run("--spans --pass md --fields list --hex 6206480401020304").lines();
     ASSERT_GE(spans.size(), 6u);
     EXPECT_EQ(spans[1], "MT=Begin  [1-8]=98");
     EXPECT_EQ(spans[2], "LENGTH=6 octet(s)  [9-16]=6");

@@ -230,10 +230,16 @@ void FieldTree::write(Text &os, const MdOut &md, const TextOptions &options) {
             if (name.size() > suffix.size() && name.substr(name.size() - suffix.size()) == suffix)
                 name.remove_suffix(suffix.size());
             os << name;
-        } else if (name.empty()) {
-            os << fieldValue(f);
         } else {
-            os << name << ": " << fieldValue(f);
+            if (!name.empty())
+                os << name << ": ";
+            // A code without a name in the module's tables shows as
+            // empty text; people are shown the number.
+            const std::string_view value = fieldValue(f);
+            if (value.empty() && !all && f.spans.size() == 1)
+                os << '(' << f.spans[0].value << ')';
+            else
+                os << value;
         }
         if (options.spans)
             writeSpans(os, f);
