@@ -94,9 +94,15 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
         const std::string type = hex[i].substr(0, 2);
         ASSERT_TRUE(typeNames.count(type)) << type;
         ++typesSeen[type];
-        EXPECT_EQ(md["fields"][0], json({{"id", 3604}, {"label", "MT"}, {"text", "MT=" + typeNames.at(type)},
-                                         {"selector", 0}, {"spans", {{1, 8, std::stoi(type, nullptr, 16)}}}}));
-        EXPECT_EQ(o["keys"]["entries"][0], json({{"index", 0}, {"name", "MT"}, {"value", type}, {"bits", 8}}));
+        const int code = std::stoi(type, nullptr, 16);
+        EXPECT_EQ(md["fields"][0], json({{"id", 3604},
+                                         {"label", "MT"},
+                                         {"text", "MT=" + typeNames.at(type)},
+                                         {"value", typeNames.at(type)},
+                                         {"selector", 0},
+                                         {"spans", {{1, 8, code}}}}));
+        EXPECT_EQ(o["keys"]["entries"][0],
+                  json({{"index", 0}, {"name", "MT"}, {"value", type}, {"bits", 8}, {"text", std::to_string(code)}}));
     }
     EXPECT_EQ(typesSeen.size(), typeNames.size()) << "samples cover every message type";
 
@@ -105,7 +111,8 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
     EXPECT_EQ(o["md"]["layer"], json::parse(R"({"first":1,"last":64})"));
     EXPECT_EQ(o["display"]["fields"][0], json::parse(R"({"displayId":3604,"text":"Begin"})"));
     EXPECT_EQ(o["keys"]["entries"][1],
-              json::parse(R"({"index":26,"name":"Originating Transaction Id","value":"01020304","bits":32})"));
+              json::parse(
+                  R"({"index":26,"name":"Originating Transaction Id","value":"01020304","bits":32,"text":"01020304"})"));
 }
 
 TEST(DpxDecodeRun, TextShowsFieldLinesVerdictAndKeys) {

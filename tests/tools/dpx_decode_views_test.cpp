@@ -136,21 +136,21 @@ Originating Transaction Id: 01020304
     ASSERT_EQ(indefinite.status, 0) << indefinite.err;
     EXPECT_EQ(messages(indefinite), (std::vector<Lines>{
                                         {"MT: Continue  [1-8]=101",
-                                         "Originating Transaction Id: 01020304  [21-24]=0 [17-20]=1 [29-32]=0 "
-                                         "[25-28]=2 [37-40]=0 [33-36]=3 [45-48]=0 [41-44]=4",
-                                         "Destination Transaction Id: 0a0b0c0d  [69-72]=0 [65-68]=10 [77-80]=0 "
-                                         "[73-76]=11 [85-88]=0 [81-84]=12 [93-96]=0 [89-92]=13",
-                                         "Component Portion  [97-104]=108", "  Invoke  [113-120]=161",
-                                         "    Invoke Id: 1  [145-152]=1",
-                                         "    Operation Code Tag: Local Operation Code  [153-160]=2",
-                                         "    Operation ID(Invoke): Activity Test  [169-176]=55",
-                                         "  Return Result (Last)  [177-184]=162", "    Invoke Id: 2  [209-216]=2",
-                                         "  Return Error  [217-224]=163", "    Invoke Id: 3  [249-256]=3",
-                                         "    Error Code Tag: Local Error Code  [257-264]=2",
-                                         "    Error Code: (9)  [273-280]=9"},
-                                        {"MT: Begin  [1-8]=98", "Originating Transaction Id: 01020304  [21-24]=0 "
-                                                                "[17-20]=1 [29-32]=0 [25-28]=2 [37-40]=0 [33-36]=3 "
-                                                                "[45-48]=0 [41-44]=4",
+                                         "Originating Transaction Id: 01020304  [37-40]=0 [33-36]=1 [45-48]=0 "
+                                         "[41-44]=2 [53-56]=0 [49-52]=3 [61-64]=0 [57-60]=4",
+                                         "Destination Transaction Id: 0a0b0c0d  [85-88]=0 [81-84]=10 [93-96]=0 "
+                                         "[89-92]=11 [101-104]=0 [97-100]=12 [109-112]=0 [105-108]=13",
+                                         "Component Portion  [113-120]=108", "  Invoke  [129-136]=161",
+                                         "    Invoke Id: 1  [161-168]=1",
+                                         "    Operation Code Tag: Local Operation Code  [169-176]=2",
+                                         "    Operation ID(Invoke): Activity Test  [185-192]=55",
+                                         "  Return Result (Last)  [193-200]=162", "    Invoke Id: 2  [225-232]=2",
+                                         "  Return Error  [233-240]=163", "    Invoke Id: 3  [265-272]=3",
+                                         "    Error Code Tag: Local Error Code  [273-280]=2",
+                                         "    Error Code: (9)  [289-296]=9"},
+                                        {"MT: Begin  [1-8]=98",
+                                         "Originating Transaction Id: 01020304  [37-40]=0 [33-36]=1 [45-48]=0 "
+                                         "[41-44]=2 [53-56]=0 [49-52]=3 [61-64]=0 [57-60]=4",
                                          "errors: left-over bits skipped"}}));
 }
 
@@ -292,8 +292,9 @@ TEST(DpxDecodeViews, KeyTextsAndBulkDocumentsCarryTheKeyFieldValues) {
         EXPECT_EQ(doc["message"], m);
         EXPECT_EQ(doc["hex"], o["hex"]);
         EXPECT_EQ(doc.contains("@timestamp"), captured);
-        if (captured)
+        if (captured) {
             EXPECT_EQ(doc["frame"], o["frame"]);
+        }
         EXPECT_EQ(doc["errorFlags"], o["md"]["errorFlags"]);
         size_t keys = 0;
         for (const json &e : o["keys"]["entries"]) {
@@ -315,8 +316,9 @@ TEST(DpxDecodeViews, KeyTextsAndBulkDocumentsCarryTheKeyFieldValues) {
                 EXPECT_EQ(e["text"], std::to_string(code));
                 EXPECT_EQ(indexed["code"], code);
                 if (camel::kFields[camel::fieldIndex((*field)["id"])].render == camel::Render::Enum &&
-                    !valueOf(*field).empty())
+                    !valueOf(*field).empty()) {
                     EXPECT_EQ(indexed["name"], valueOf(*field));
+                }
             } else {
                 EXPECT_EQ(e["text"], valueOf(*field)) << entry;
                 EXPECT_EQ(indexed, valueOf(*field)) << entry;
@@ -371,7 +373,8 @@ TEST(DpxDecodeViews, GlobalTitleDigitsOfSccpAddresses) {
         std::vector<uint8_t> m{0x09, 0x00, 0x03, uint8_t(3 + c.called.size()), uint8_t(5 + c.called.size()),
                                uint8_t(c.called.size())};
         m.insert(m.end(), c.called.begin(), c.called.end());
-        m.insert(m.end(), {0x02, 0x42, 0x92, 0x02, 0x61, 0x00});
+        // Calling: SSN only (the SSN indicator is bit 1 in ANSI, bit 2 in ITU).
+        m.insert(m.end(), {0x02, uint8_t(c.ansi ? 0x41 : 0x42), 0x92, 0x02, 0x61, 0x00});
         const cap::SccpOut s = cap::parseSccp(cap::Bytes{m.data(), m.size()}, c.ansi);
         ASSERT_EQ(s.skip, cap::Skip::None);
         EXPECT_EQ(std::string(s.called.gt.digits, s.called.gt.size), c.digits);
