@@ -15,8 +15,8 @@
 #include <string>
 #include <vector>
 
-#include "hex_line.h"
-#include "input.h"
+#include "input/hex_line.h"
+#include "input/input.h"
 #include "module.h"
 #include "views/ek_output.h"
 #include "views/output.h"

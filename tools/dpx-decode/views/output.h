@@ -7,7 +7,7 @@
 #include <string>
 #include <string_view>
 
-#include "input.h"
+#include "input/input.h"
 #include "module.h"
 
 namespace dpxdecode {
