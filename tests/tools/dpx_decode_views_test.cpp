@@ -12,8 +12,7 @@
 #include <string>
 #include <vector>
 
-#include "../../tools/dpx-decode/capture/sccp.h"
-#include "../../tools/dpx-decode/hex_line.h"
+#include "../../tools/dpx-decode/carriers/sccp.h"
 #include "fields/field_table.h"
 #include "support/dpx_decode_run.h"
 

@@ -6,7 +6,7 @@
 #include <iosfwd>
 #include <string>
 
-#include "input.h"
+#include "input/input.h"
 #include "module.h"
 #include "output.h"
 #include "summary.h"
