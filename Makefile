@@ -6,7 +6,7 @@
 #   make demo    deps, build dpx-decode and the module only, then decode the
 #                bundled sample messages: a call flow's summary, one Initial
 #                DP in the readable view, statistics over every sample
-#   make install build, then install dpx-decode, the module and the host
+#   make install build and install dpx-decode, the module and the host
 #                libraries under PREFIX (default /usr/local)
 #   make test    deps, then build and test the native, asan and m32 presets
 #   make bench   build, then run the benchmarks
@@ -80,7 +80,10 @@ demo: deps
 	@$(DECODE) --stats --pass none $(SAMPLES) $(DEMO_CAPTURE) | grep -v '^service key\|^cause\|^event'
 	@echo "   ... (service keys, causes and events left out here)"
 
-install: build
+# Builds what is installed only: dpx-decode, the module and the host libraries.
+install:
+	cmake --preset native >/dev/null
+	cmake --build --preset native --target dpx-decode
 	cmake --install build/native --prefix "$(PREFIX)"
 
 # Each preset is configured, built and tested in turn; the first failure stops.
