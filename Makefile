@@ -3,8 +3,11 @@
 #   make deps    install the Debian packages the build needs (root or sudo),
 #                qemu-user too where 32-bit x86 programs do not run natively
 #   make build   configure and build the native preset (build/native)
-#   make demo    deps + build, then decode the bundled sample messages and a
-#                sample capture
+#   make demo    deps, build dpx-decode and the module only, then decode the
+#                bundled sample messages: a call flow's summary, one Initial
+#                DP in the readable view, statistics over every sample
+#   make install build and install dpx-decode, the module and the host
+#                libraries under PREFIX (default /usr/local)
 #   make test    deps, then build and test the native, asan and m32 presets
 #   make bench   build, then run the benchmarks
 #   make bench-capture   build, then dpx-decode against tshark on a capture
@@ -32,10 +35,11 @@ M32_CHECK := m32=$$($(M32_RUNNER) 2>&1) || { echo "make test: $$m32" >&2; exit 1
 
 SAMPLES := $(sort $(wildcard samples/*.txt))
 # A call flow over Ethernet/IPv4/SCTP/M3UA/SCCP (samples/callflow.hex).
-DEMO_CAPTURES := samples/callflow-m3ua.pcap
-DEMO_ARGS ?= $(SAMPLES) $(DEMO_CAPTURES)
+DEMO_CAPTURE := samples/callflow-m3ua.pcap
+DECODE := build/native/dpx-decode
+PREFIX ?= /usr/local
 
-.PHONY: deps build demo test bench clean $(addprefix test-,$(PRESETS))
+.PHONY: deps build demo install test bench clean $(addprefix test-,$(PRESETS))
 
 deps:
 	@missing=""; \
@@ -61,11 +65,26 @@ build:
 	cmake --preset native
 	cmake --build --preset native
 
-demo: deps build
-	@if [ -z "$(strip $(DEMO_ARGS))" ]; then \
-	    echo "make demo: no sample messages in samples/" >&2; exit 1; \
-	fi
-	build/native/dpx-decode $(DEMO_ARGS)
+# Only what the demonstration runs is built (no tests, no benchmarks).
+demo: deps
+	@test -n "$(SAMPLES)" -a -f $(DEMO_CAPTURE) \
+	    || { echo "make demo: the sample messages are missing from samples/" >&2; exit 1; }
+	cmake --preset native >/dev/null
+	cmake --build --preset native --target dpx-decode
+	@echo; echo "== A call flow, one line a message: $(DECODE) --summary $(DEMO_CAPTURE)"
+	@$(DECODE) --summary $(DEMO_CAPTURE) | head -n 18
+	@echo "   ..."
+	@echo; echo "== One Initial DP, readable: $(DECODE) --hex HEX (--fields all: every field)"
+	@$(DECODE) --hex $$(grep -A1 -m1 'Begin: InitialDP' samples/callflow.hex | tail -n 1)
+	@echo "== Statistics over every bundled sample: $(DECODE) --stats --pass none samples/*.txt $(DEMO_CAPTURE)"
+	@$(DECODE) --stats --pass none $(SAMPLES) $(DEMO_CAPTURE) | grep -v '^service key\|^cause\|^event'
+	@echo "   ... (service keys, causes and events left out here)"
+
+# Builds what is installed only: dpx-decode, the module and the host libraries.
+install:
+	cmake --preset native >/dev/null
+	cmake --build --preset native --target dpx-decode
+	cmake --install build/native --prefix "$(PREFIX)"
 
 # Each preset is configured, built and tested in turn; the first failure stops.
 test: deps

@@ -81,7 +81,8 @@ TEST_F(DpxDecodeCapture, JsonAndTextSayWhereEachMessageCameFrom) {
         Lines members;
         for (const auto &item : first.items())
             members.push_back(item.key());
-        EXPECT_EQ(members, (Lines{"index", "hex", "frame", "time", "opc", "dpc", "calledSsn", "callingSsn", "view"}));
+        EXPECT_EQ(members, (Lines{"index", "hex", "frame", "time", "opc", "dpc", "calledSsn", "callingSsn", "calledGt",
+                                  "callingGt", "view"}));
         EXPECT_EQ(first["frame"], 2);
         EXPECT_EQ(first["time"], "1767225600.001000000");
         EXPECT_EQ(first["opc"], 100);
@@ -93,9 +94,11 @@ TEST_F(DpxDecodeCapture, JsonAndTextSayWhereEachMessageCameFrom) {
 
         const Outcome t = run("--pass view " + quote(file));
         ASSERT_EQ(t.status, 0) << t.err;
-        EXPECT_EQ(t.out, "frame 2 at 1767225600.001000000: opc 100, dpc 200, called SSN 146, calling SSN 147\n"
+        EXPECT_EQ(t.out, "frame 2 at 2026-01-01T00:00:00.001000Z: opc 100, dpc 200, called SSN 146, calling SSN 147, "
+                         "called GT -, calling GT -\n"
                          "message 0: 6206480401020304\nview: valid\n\n"
-                         "frame 3 at 1767225600.002000000: opc 100, dpc 200, called SSN 146, calling SSN 147\n"
+                         "frame 3 at 2026-01-01T00:00:00.002000Z: opc 100, dpc 200, called SSN 146, calling SSN 147, "
+                         "called GT -, calling GT -\n"
                          "message 1: 6406490401020304\nview: valid\n\n");
     }
 }
@@ -114,8 +117,8 @@ TEST_F(DpxDecodeCapture, SummaryAndStatistics) {
     const std::string file = tempFile("flow", capture({kBegin, {}, kEnd}));
     const Outcome s = run("--summary " + quote(file));
     ASSERT_EQ(s.status, 0) << s.err;
-    EXPECT_EQ(s.out, "frame 1 1767225600.000000000 Begin otid=01020304 dtid=-\n"
-                     "frame 3 1767225600.002000000 End otid=- dtid=01020304\n");
+    EXPECT_EQ(s.out, "frame 1 2026-01-01T00:00:00.000000Z pc 100>200 ssn 147>146 gt ->- Begin otid=01020304 dtid=-\n"
+                     "frame 3 2026-01-01T00:00:00.002000Z pc 100>200 ssn 147>146 gt ->- End otid=- dtid=01020304\n");
     const Outcome st = run("--stats --pass view " + quote(file));
     ASSERT_EQ(st.status, 0) << st.err;
     const Lines l = st.lines();

@@ -94,9 +94,15 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
         const std::string type = hex[i].substr(0, 2);
         ASSERT_TRUE(typeNames.count(type)) << type;
         ++typesSeen[type];
-        EXPECT_EQ(md["fields"][0], json({{"id", 3604}, {"label", "MT"}, {"text", "MT=" + typeNames.at(type)},
-                                         {"selector", 0}, {"spans", {{1, 8, std::stoi(type, nullptr, 16)}}}}));
-        EXPECT_EQ(o["keys"]["entries"][0], json({{"index", 0}, {"name", "MT"}, {"value", type}, {"bits", 8}}));
+        const int code = std::stoi(type, nullptr, 16);
+        EXPECT_EQ(md["fields"][0], json({{"id", 3604},
+                                         {"label", "MT"},
+                                         {"text", "MT=" + typeNames.at(type)},
+                                         {"value", typeNames.at(type)},
+                                         {"selector", 0},
+                                         {"spans", {{1, 8, code}}}}));
+        EXPECT_EQ(o["keys"]["entries"][0],
+                  json({{"index", 0}, {"name", "MT"}, {"value", type}, {"bits", 8}, {"text", std::to_string(code)}}));
     }
     EXPECT_EQ(typesSeen.size(), typeNames.size()) << "samples cover every message type";
 
@@ -105,11 +111,13 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
     EXPECT_EQ(o["md"]["layer"], json::parse(R"({"first":1,"last":64})"));
     EXPECT_EQ(o["display"]["fields"][0], json::parse(R"({"displayId":3604,"text":"Begin"})"));
     EXPECT_EQ(o["keys"]["entries"][1],
-              json::parse(R"({"index":26,"name":"Originating Transaction Id","value":"01020304","bits":32})"));
+              json::parse(
+                  R"({"index":26,"name":"Originating Transaction Id","value":"01020304","bits":32,"text":"01020304"})"));
 }
 
 TEST(DpxDecodeRun, TextShowsFieldLinesVerdictAndKeys) {
-    const Outcome r = run("--hex 6206480401020304 --hex '62 06 49 04 01 02 03 04'");
+    const Outcome r =
+        run("--fields list --pass md,display,view,keys --hex 6206480401020304 --hex '62 06 49 04 01 02 03 04'");
     ASSERT_EQ(r.status, 0) << r.err;
     const Lines lines = r.lines();
     ASSERT_GE(lines.size(), 14u);
@@ -122,7 +130,7 @@ TEST(DpxDecodeRun, TextShowsFieldLinesVerdictAndKeys) {
     EXPECT_NE(r.out.find("view: invalid: mandatory element missing, left-over bits skipped\n"),
               std::string::npos) << r.out;
 
-    const Lines spans = run("--spans --pass md --hex 6206480401020304").lines();
+    const Lines spans = run("--spans --pass md --fields list --hex 6206480401020304").lines();
     ASSERT_GE(spans.size(), 6u);
     EXPECT_EQ(spans[1], "MT=Begin  [1-8]=98");
     EXPECT_EQ(spans[2], "LENGTH=6 octet(s)  [9-16]=6");

@@ -18,6 +18,7 @@
 #include "input/hex_line.h"
 #include "input/input.h"
 #include "module.h"
+#include "views/ek_output.h"
 #include "views/output.h"
 #include "views/summary.h"
 
@@ -89,16 +90,28 @@ int main(int argc, char **argv) {
     bool summary = false;
     bool stats = false;
     bool ansi = false;
+    std::string fieldsMode = "values";
+    std::string timeFormat = "utc";
+    bool version = false;
 
     app.add_option("files", files, "files of hex messages or captures ('-' is standard input)");
     app.add_option("--hex", hexArgs, "a message in hex (repeatable)")->allow_extra_args(false);
-    auto *passOption = app.add_option("--pass", passNames, "passes to run: md, display, view, keys (default all)")
+    auto *passOption = app.add_option("--pass", passNames,
+                                      "passes to run and show: md, display, view, keys or none (default: md in "
+                                      "text, all four in json)")
                            ->delimiter(',')
-                           ->check(CLI::IsMember({"md", "display", "view", "keys"}))
+                           ->check(CLI::IsMember({"md", "display", "view", "keys", "none"}))
                            ->allow_extra_args(false);
-    app.add_option("--format", format, "output format: text or json")
-        ->check(CLI::IsMember({"text", "json"}));
+    app.add_option("--format", format, "output format: text, json or ek (bulk-index actions and documents)")
+        ->check(CLI::IsMember({"text", "json", "ek"}));
+    app.add_option("--fields", fieldsMode,
+                   "text output: values (nested, tags and lengths folded; default), all (nested, every field) "
+                   "or list (flat, as reported)")
+        ->check(CLI::IsMember({"values", "all", "list"}));
+    app.add_option("--time", timeFormat, "capture times in text: utc (ISO 8601, default), epoch or relative")
+        ->check(CLI::IsMember({"utc", "epoch", "relative"}));
     app.add_flag("--spans", spans, "text output: append each field's bit ranges [first-last]=value");
+    app.add_flag("--version", version, "print the module's version and interface version, and exit");
     app.add_option("--module", modulePath,
                    "decoder module to load (default: 3gpp_camel_400_DLL.so beside dpx-decode)");
     app.add_option("--ssn", ssnList,
@@ -120,6 +133,10 @@ int main(int argc, char **argv) {
         return kExitUsage;
     }
     inputOptions.progress = isatty(STDERR_FILENO) == 1;
+    if (format == "ek" && (summary || stats || passOption->count() > 0)) {
+        std::cerr << "dpx-decode: --format ek writes bulk-index documents only: no --summary, --stats or --pass\n";
+        return kExitUsage;
+    }
 
     if (modulePath.empty()) {
         modulePath = dpxdecode::defaultModulePath();
@@ -134,23 +151,43 @@ int main(int argc, char **argv) {
         std::cerr << "dpx-decode: cannot load module: " << error << '\n';
         return kExitNoModule;
     }
+    if (version) {
+        const void *interfaceVersion = nullptr;
+        const bool served = module.getPtr(1, &interfaceVersion) == 0 && interfaceVersion != nullptr;
+        std::cout << "dpx-decode " DPX_VERSION "\nmodule " << modulePath << "\ninterface version "
+                  << (served ? static_cast<const char *>(interfaceVersion) : "(not served)") << '\n';
+        return served ? 0 : kExitNoModule;
+    }
 
     std::ios::sync_with_stdio(false);
     static char outBuffer[1 << 16];
     std::cout.rdbuf()->pubsetbuf(outBuffer, sizeof outBuffer);
 
-    // The summary and the statistics are made from the decoded-field pass:
-    // it runs for them even when its output is not wanted.
-    dpxdecode::PassSelection passes = selectPasses(passNames);
-    if (summary && passOption->count() == 0)
-        passes = dpxdecode::PassSelection{false, false, false, false};
-    const bool showMd = passes.md;
-    const bool passOutput = !summary || passOption->count() > 0;
-    dpxdecode::PassSelection run = passes;
-    run.md |= summary || stats;
-
+    // What is shown: the readable fields in text, every pass in JSON, the
+    // passes named with --pass.  The summary, the statistics and the
+    // bulk-index documents are made from the decoded-field and key-field
+    // passes: those run for them even when their output is not wanted.
     const bool json = format == "json";
-    const dpxdecode::TextOptions textOptions{spans};
+    const bool ek = format == "ek";
+    const bool named = passOption->count() > 0;
+    dpxdecode::PassSelection passes = selectPasses(passNames);
+    if (!named && !json)
+        passes = dpxdecode::PassSelection{!summary && !ek, false, false, false};
+    const bool showMd = passes.md;
+    const bool passOutput = !ek && (!summary || named) && (passes.md || passes.display || passes.view || passes.keys);
+    dpxdecode::PassSelection run = passes;
+    run.md |= summary || stats || ek;
+    run.keys |= ek;
+
+    dpxdecode::TimeFormatter time(timeFormat == "epoch"      ? dpxdecode::TimeFormat::Epoch
+                                  : timeFormat == "relative" ? dpxdecode::TimeFormat::Relative
+                                                             : dpxdecode::TimeFormat::Utc,
+                                  module.dateConv);
+    const dpxdecode::TextOptions textOptions{spans,
+                                             fieldsMode == "all"    ? dpxdecode::FieldsMode::All
+                                             : fieldsMode == "list" ? dpxdecode::FieldsMode::List
+                                                                    : dpxdecode::FieldsMode::Values,
+                                             &time};
     uint64_t index = 0;
     dpxdecode::Session session(module);
     if (!session.ok()) {
@@ -166,12 +203,15 @@ int main(int argc, char **argv) {
         hexArgs, files, inputOptions,
         [&](const dpxdecode::InputMessage &msg) {
             session.run(msg.bytes.data(), msg.bytes.size(), run, result);
-            if (summary || stats) {
+            if (summary || stats || ek) {
                 dpxdecode::summarize(*result.md, messageSummary);
+                if (ek)
+                    dpxdecode::writeEk(std::cout, msg, index, dpxdecode::toHex(msg.bytes), result, messageSummary,
+                                       time);
                 if (stats)
-                    statistics.add(messageSummary, result.md->errorFlags);
+                    statistics.add(messageSummary);
                 if (summary)
-                    dpxdecode::writeSummary(std::cout, index, msg.capture, messageSummary);
+                    dpxdecode::writeSummary(std::cout, index, msg.capture, messageSummary, time, json);
             }
             if (passOutput) {
                 // The decoded fields made only for the summary or the

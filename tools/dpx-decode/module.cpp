@@ -64,7 +64,11 @@ std::string defaultModulePath() {
     const size_t slash = path.rfind('/');
     if (slash == std::string::npos)
         return {};
-    return path.substr(0, slash + 1) + kModuleFile;
+    // Beside the executable (a build directory), else where an install
+    // puts it (PREFIX/bin/dpx-decode, PREFIX/lib/dpx-camel/).
+    const std::string beside = path.substr(0, slash + 1) + kModuleFile;
+    const std::string installed = path.substr(0, slash + 1) + "../lib/dpx-camel/" + kModuleFile;
+    return access(beside.c_str(), F_OK) != 0 && access(installed.c_str(), F_OK) == 0 ? installed : beside;
 }
 
 bool loadModule(const std::string &path, Module &module, std::string &error) {

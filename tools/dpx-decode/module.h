@@ -24,8 +24,9 @@ struct Module {
     decltype(&date_conv) dateConv = nullptr;
 };
 
-// 3gpp_camel_400_DLL.so in the directory of the running executable; empty
-// when that directory cannot be found.
+// 3gpp_camel_400_DLL.so in the directory of the running executable, or in
+// ../lib/dpx-camel from there when only that one exists; empty when the
+// directory cannot be found.
 std::string defaultModulePath();
 
 // Loads the module at `path` and resolves every entry point.  On failure

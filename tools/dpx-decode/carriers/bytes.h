@@ -26,6 +26,25 @@ struct Bytes {
     Bytes from(size_t at) const { return Bytes{data + at, size - at}; }
 };
 
+// The global-title address digits of an SCCP or SUA address: one
+// character per half-octet, first digit in the low half, the filler of an
+// odd count left out.  Digits past kMaxDigits are not kept.
+struct GlobalTitle {
+    static constexpr size_t kMaxDigits = 40;
+    uint8_t size = 0; // 0: the address has no global title
+    char digits[kMaxDigits] = {};
+
+    // `count` digits (all of the value's half-octets when it is larger).
+    void read(Bytes value, size_t count) {
+        static const char hex[] = "0123456789abcdef";
+        size = 0;
+        for (size_t i = 0; i < count && i / 2 < value.size && size < kMaxDigits; ++i) {
+            const uint8_t octet = value.u8(i / 2);
+            digits[size++] = hex[i % 2 == 0 ? octet & 0x0F : octet >> 4];
+        }
+    }
+};
+
 // Why nothing (more) was taken from a frame.  Each is counted.
 enum class Skip : uint8_t {
     None,

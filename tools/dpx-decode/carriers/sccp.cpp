@@ -6,6 +6,34 @@ namespace {
 constexpr uint8_t kParamEnd = 0x00;
 constexpr uint8_t kParamSegmentation = 0x10;
 
+// The global title after the point code and SSN: its indicator says which
+// of translation type, numbering plan with encoding scheme and nature of
+// address come before the digits, and how their count is known.
+void readGlobalTitle(Bytes a, size_t at, uint8_t indicator, bool ansi, GlobalTitle &gt) {
+    const unsigned gti = (indicator >> 2) & 0x0F;
+    size_t header = 0;
+    int odd = -1; // -1: not said, every half-octet is a digit
+    if (ansi) {
+        header = gti == 1 ? 2 : gti == 2 ? 1 : 0;
+        if (gti == 1 && a.has(at + 1, 1))
+            odd = (a.u8(at + 1) & 0x0F) == 1;
+    } else if (gti == 1) {
+        header = 1;
+        if (a.has(at, 1))
+            odd = (a.u8(at) & 0x80) != 0;
+    } else if (gti == 2) {
+        header = 1;
+    } else if (gti == 3 || gti == 4) {
+        header = gti == 3 ? 2 : 3;
+        if (a.has(at + 1, 1))
+            odd = (a.u8(at + 1) & 0x0F) == 1;
+    }
+    if (header == 0 || !a.has(at, header))
+        return;
+    const Bytes digits = a.from(at + header);
+    gt.read(digits, digits.size * 2 - (odd == 1 && digits.size > 0 ? 1 : 0));
+}
+
 bool parseAddress(Bytes a, bool ansi, SccpAddress &out) {
     out.raw = a;
     if (!a.has(0, 1))
@@ -24,7 +52,9 @@ bool parseAddress(Bytes a, bool ansi, SccpAddress &out) {
             if (!a.has(at, 3))
                 return false;
             out.pointCode = a.le24(at);
+            at += 3;
         }
+        readGlobalTitle(a, at, indicator, true, out.gt);
         return true;
     }
     out.hasPointCode = indicator & 0x01;
@@ -38,8 +68,9 @@ bool parseAddress(Bytes a, bool ansi, SccpAddress &out) {
     if (out.hasSsn) {
         if (!a.has(at, 1))
             return false;
-        out.ssn = a.u8(at);
+        out.ssn = a.u8(at++);
     }
+    readGlobalTitle(a, at, indicator, false, out.gt);
     return true;
 }
 

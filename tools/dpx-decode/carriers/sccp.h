@@ -25,6 +25,7 @@ struct SccpAddress {
     bool hasSsn = false;
     uint32_t pointCode = 0;
     uint8_t ssn = 0;
+    GlobalTitle gt;
     Bytes raw; // the whole address, for telling segments apart
 };
 

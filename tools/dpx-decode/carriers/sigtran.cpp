@@ -69,6 +69,10 @@ SuaAddress suaAddress(Bytes v) {
             a.pointCode = value.be32(0) & 0xFFFFFF;
         } else if (tag == 0x8003 && value.has(0, 4)) {
             a.ssn = value.u8(3);
+        } else if (tag == 0x8001 && value.has(0, 8)) {
+            // Reserved, GTI, digit count, translation type, numbering
+            // plan, nature of address, then the digits.
+            a.gt.read(value.from(8), value.u8(4));
         }
     }
     return a;

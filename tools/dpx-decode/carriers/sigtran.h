@@ -40,6 +40,7 @@ struct SuaAddress {
     bool hasPointCode = false;
     uint32_t pointCode = 0;
     uint8_t ssn = 0;
+    GlobalTitle gt;
 };
 
 struct SuaOut {

@@ -161,6 +161,8 @@ void FrameWalker::userMessage(uint32_t protocolId, uint16_t sport, uint16_t dpor
         m.hasCallingSsn = s.calling.ssn != 0;
         m.calledSsn = s.called.ssn;
         m.callingSsn = s.calling.ssn;
+        m.calledGt = s.called.gt;
+        m.callingGt = s.calling.gt;
         emit(m, sink);
         return;
     }
@@ -193,6 +195,8 @@ void FrameWalker::sccp(Bytes message, const Origin &origin, MessageSink &sink) {
     m.hasCallingSsn = s.calling.hasSsn;
     m.calledSsn = s.called.ssn;
     m.callingSsn = s.calling.ssn;
+    m.calledGt = s.called.gt;
+    m.callingGt = s.calling.gt;
     if (!selected(m))
         return;
     switch (sccp_.add(m.opc, s, m.tcap)) {

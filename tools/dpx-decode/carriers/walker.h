@@ -23,6 +23,8 @@ struct TcapMessage {
     bool hasCallingSsn = false;
     uint8_t calledSsn = 0;
     uint8_t callingSsn = 0;
+    GlobalTitle calledGt; // size 0 when the address has none
+    GlobalTitle callingGt;
 };
 
 struct WalkOptions {

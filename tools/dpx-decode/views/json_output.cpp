@@ -1,70 +1,16 @@
-// JSON output written straight into a buffer: the same text nlohmann's
-// compact dump gives (members in order, no blanks), without building a
-// document per message.
-#include <nlohmann/json.hpp>
-
+// JSON output written straight into a buffer, without building a document
+// per message.
 #include <ostream>
 #include <string>
 
+#include "json_writer.h"
+#include "key_text.h"
 #include "output.h"
 
 namespace dpxdecode {
 namespace {
 
-class Writer {
-public:
-    explicit Writer(std::string &out) : out_(out) {}
-
-    Writer &raw(const char *s) {
-        out_ += s;
-        return *this;
-    }
-    Writer &number(uint64_t v) {
-        char buf[24];
-        char *p = buf + sizeof buf;
-        do {
-            *--p = char('0' + v % 10);
-            v /= 10;
-        } while (v != 0);
-        out_.append(p, size_t(buf + sizeof buf - p));
-        return *this;
-    }
-    Writer &number(int64_t v) {
-        if (v < 0) {
-            out_ += '-';
-            return number(uint64_t(0) - uint64_t(v));
-        }
-        return number(uint64_t(v));
-    }
-    Writer &number(uint32_t v) { return number(uint64_t(v)); }
-    Writer &number(int32_t v) { return number(int64_t(v)); }
-
-    // Plain printable ASCII is copied; anything else (escapes, UTF-8, bytes
-    // that are not UTF-8) goes through nlohmann's serializer so the
-    // escaping and the U+FFFD replacement stay exactly its own.
-    Writer &string(const std::string &s) {
-        for (const char c : s) {
-            const auto u = static_cast<unsigned char>(c);
-            if (u < 0x20 || u >= 0x7F || c == '"' || c == '\\') {
-                out_ += nlohmann::json(s).dump(-1, ' ', false, nlohmann::json::error_handler_t::replace);
-                return *this;
-            }
-        }
-        out_ += '"';
-        out_ += s;
-        out_ += '"';
-        return *this;
-    }
-    Writer &key(const char *name) {
-        out_ += '"';
-        out_ += name;
-        out_ += "\":";
-        return *this;
-    }
-
-private:
-    std::string &out_;
-};
+using Writer = JsonWriter;
 
 void common(Writer &w, const PassOutcome &p) {
     w.raw("{").key("result").number(p.result).raw(",").key("remainingBits").number(p.remainingBits);
@@ -80,6 +26,7 @@ void mdJson(Writer &w, const MdOut &md) {
         w.raw(firstField ? "{" : ",{");
         firstField = false;
         w.key("id").number(f.id).raw(",").key("label").string(f.label).raw(",").key("text").string(f.text);
+        w.raw(",").key("value").string(fieldValue(f));
         w.raw(",").key("selector").number(f.selector).raw(",").key("spans").raw("[");
         bool firstSpan = true;
         for (const SpanOut &s : f.spans) {
@@ -108,12 +55,15 @@ void viewJson(Writer &w, const ViewOut &v) {
 }
 
 void keysJson(Writer &w, const KeysOut &k) {
+    static thread_local KeyText text;
     common(w, k);
     w.raw(",").key("entries").raw("[");
     bool first = true;
     for (const KeyEntryOut &e : k.entries) {
         w.raw(first ? "{" : ",{").key("index").number(e.index).raw(",").key("name").string(keyEntryName(e.index));
         w.raw(",").key("value").string(e.value).raw(",").key("bits").number(e.bits);
+        if (keyText(e, text))
+            w.raw(",").key("text").string(text.text);
         if (e.overflow)
             w.raw(",").key("overflow").raw("true");
         w.raw("}");
@@ -145,6 +95,15 @@ void writeJson(std::ostream &os, uint64_t index, const std::string &hex, const M
         optional("dpc", c.hasPointCodes, c.dpc);
         optional("calledSsn", c.hasCalledSsn, c.calledSsn);
         optional("callingSsn", c.hasCallingSsn, c.callingSsn);
+        const auto gt = [&w](const char *name, const capture::GlobalTitle &g) {
+            w.raw(",").key(name);
+            if (g.size == 0)
+                w.raw("null");
+            else
+                w.string(std::string(g.digits, g.size));
+        };
+        gt("calledGt", c.calledGt);
+        gt("callingGt", c.callingGt);
     }
     if (r.md)
         mdJson(w.raw(",").key("md"), *r.md);

@@ -3,7 +3,9 @@
 #include <ostream>
 #include <string>
 #include <type_traits>
+#include <vector>
 
+#include "field_kinds.h"
 #include "output.h"
 
 namespace dpxdecode {
@@ -13,7 +15,7 @@ namespace {
 // once, rather than a stream insertion per value.
 struct Text {
     std::string s;
-    Text &operator<<(const std::string &v) {
+    Text &operator<<(std::string_view v) {
         s += v;
         return *this;
     }
@@ -96,7 +98,200 @@ void writeKeys(Text &os, const KeysOut &k) {
     }
 }
 
+void writeSpans(Text &os, const DecodedOut &f) {
+    os << ' ';
+    for (const SpanOut &s : f.spans)
+        os << " [" << s.first << '-' << s.last << "]=" << s.value;
+}
+
+// The decoded fields as a tree.  An element is a tag field, the length
+// field right after it and every field whose bits lie inside the length
+// it gives; an indefinite length runs to its end-of-contents.  The tree is
+// worked out in one sweep over the fields' bit spans, kept in arrays that
+// are reused from message to message.
+class FieldTree {
+public:
+    void write(Text &os, const MdOut &md, const TextOptions &options);
+
+private:
+    static constexpr int32_t kNone = -1;
+    struct Open {
+        int32_t tag;  // index of the element's tag field
+        uint32_t end; // last bit of the element
+        uint32_t tagLast;
+        bool indefinite;
+        bool awaitingLength;
+    };
+    void build(const MdOut &md);
+    bool collapsed(size_t tag) const {
+        return shown_[tag] == 1 && fieldKind(ids_[size_t(only_[tag])]) == FieldKind::Value;
+    }
+
+    std::vector<Open> stack_;
+    std::vector<int32_t> parent_; // per field: its element's tag field
+    std::vector<uint32_t> ids_;
+    std::vector<uint16_t> shown_; // per tag field: children shown in the values view
+    std::vector<int32_t> only_;   // per tag field: its first such child
+    std::vector<uint16_t> depth_;
+};
+
+// The count at the front of a length field's value ("22 octet(s)");
+// false for "Indefinite Length".
+bool lengthOctets(const DecodedOut &f, uint32_t &octets) {
+    const std::string_view v = fieldValue(f);
+    const auto r = std::from_chars(v.data(), v.data() + v.size(), octets);
+    return r.ec == std::errc() && r.ptr != v.data();
+}
+
+void FieldTree::build(const MdOut &md) {
+    const size_t n = md.fields.size();
+    stack_.clear();
+    parent_.assign(n, kNone);
+    ids_.resize(n);
+    shown_.assign(n, 0);
+    only_.assign(n, kNone);
+    uint32_t lastBit = 0;
+    for (size_t i = 0; i < n; ++i) {
+        const DecodedOut &f = md.fields[i];
+        ids_[i] = f.id;
+        const FieldKind kind = fieldKind(f.id);
+        uint32_t first = lastBit, last = lastBit;
+        if (!f.spans.empty()) {
+            first = f.spans[0].first;
+            last = f.spans[0].last;
+            for (const SpanOut &s : f.spans) {
+                first = s.first < first ? s.first : first;
+                last = s.last > last ? s.last : last;
+            }
+        }
+        lastBit = last;
+        // A tag without a length right after it is an element of its own
+        // bits only.
+        if (!stack_.empty() && stack_.back().awaitingLength && kind != FieldKind::Length) {
+            stack_.back().awaitingLength = false;
+            stack_.back().end = stack_.back().tagLast;
+        }
+        while (!stack_.empty() && stack_.back().end < first)
+            stack_.pop_back();
+        if (kind == FieldKind::EndOfContents) {
+            // Closes the innermost indefinite element, to which it belongs.
+            size_t k = stack_.size();
+            while (k > 0 && !stack_[k - 1].indefinite)
+                --k;
+            if (k > 0) {
+                parent_[i] = stack_[k - 1].tag;
+                stack_.resize(k - 1);
+                continue;
+            }
+        }
+        if (!stack_.empty())
+            parent_[i] = stack_.back().tag;
+        const uint32_t outerEnd = stack_.empty() ? UINT32_MAX : stack_.back().end;
+        if (kind == FieldKind::Length && !stack_.empty() && stack_.back().awaitingLength) {
+            Open &e = stack_.back();
+            e.awaitingLength = false;
+            uint32_t octets = 0;
+            if (lengthOctets(f, octets)) {
+                const uint64_t end = uint64_t(last) + uint64_t(octets) * 8;
+                e.end = end < e.end ? uint32_t(end) : e.end;
+            } else {
+                e.indefinite = true;
+            }
+        }
+        if (parent_[i] != kNone && (kind == FieldKind::Value || kind == FieldKind::Tag)) {
+            const size_t p = size_t(parent_[i]);
+            if (shown_[p]++ == 0)
+                only_[p] = int32_t(i);
+        }
+        if (kind == FieldKind::Tag)
+            stack_.push_back(Open{int32_t(i), outerEnd, last, false, true});
+    }
+}
+
+void FieldTree::write(Text &os, const MdOut &md, const TextOptions &options) {
+    build(md);
+    const bool all = options.fields == FieldsMode::All;
+    depth_.assign(md.fields.size(), 0);
+    for (size_t i = 0; i < md.fields.size(); ++i) {
+        const DecodedOut &f = md.fields[i];
+        const FieldKind kind = fieldKind(f.id);
+        if (parent_[i] != kNone) {
+            const size_t p = size_t(parent_[i]);
+            depth_[i] = uint16_t(depth_[p] + (all || !collapsed(p) ? 1 : 0));
+        }
+        if (!all && (kind == FieldKind::Length || kind == FieldKind::EndOfContents ||
+                     (kind == FieldKind::Tag && collapsed(i))))
+            continue;
+        os.s.append(size_t(depth_[i]) * 2, ' ');
+        std::string_view name = fieldName(f);
+        if (!all && kind == FieldKind::Tag) {
+            // The element's name: its tag field's label without " Tag".
+            constexpr std::string_view suffix = " Tag";
+            if (name.size() > suffix.size() && name.substr(name.size() - suffix.size()) == suffix)
+                name.remove_suffix(suffix.size());
+            os << name;
+        } else {
+            if (!name.empty())
+                os << name << ": ";
+            // A code without a name in the module's tables shows as
+            // empty text; people are shown the number.
+            const std::string_view value = fieldValue(f);
+            if (value.empty() && !all && f.spans.size() == 1)
+                os << '(' << f.spans[0].value << ')';
+            else
+                os << value;
+        }
+        if (options.spans)
+            writeSpans(os, f);
+        os << '\n';
+    }
+}
+
+void writeOrigin(Text &os, const CaptureOrigin &origin, TimeFormatter *time) {
+    const capture::TcapMessage &c = origin.carrier;
+    os << "frame " << origin.frame << " at ";
+    if (time != nullptr)
+        time->append(os.s, origin.seconds, origin.nanoseconds);
+    else
+        os << formatTime(origin.seconds, origin.nanoseconds);
+    if (c.hasPointCodes)
+        os << ": opc " << c.opc << ", dpc " << c.dpc;
+    else
+        os << ": no point codes";
+    const auto ssn = [&os](const char *what, bool has, uint8_t value) {
+        os << what;
+        if (has)
+            os << unsigned(value);
+        else
+            os << '-';
+    };
+    ssn(", called SSN ", c.hasCalledSsn, c.calledSsn);
+    ssn(", calling SSN ", c.hasCallingSsn, c.callingSsn);
+    const auto gt = [&os](const char *what, const capture::GlobalTitle &g) {
+        os << what;
+        if (g.size == 0)
+            os << '-';
+        else
+            os << std::string_view(g.digits, g.size);
+    };
+    gt(", called GT ", c.calledGt);
+    gt(", calling GT ", c.callingGt);
+    os << '\n';
+}
+
 } // namespace
+
+std::string_view fieldValue(const DecodedOut &f) {
+    const size_t eq = f.text.find('=');
+    return eq == std::string::npos ? std::string_view(f.text) : std::string_view(f.text).substr(eq + 1);
+}
+
+std::string_view fieldName(const DecodedOut &f) {
+    std::string_view name = f.label;
+    while (!name.empty() && name.front() == ' ')
+        name.remove_prefix(1);
+    return name;
+}
 
 std::string describeErrorFlags(uint32_t flags) {
     std::string s;
@@ -125,36 +320,23 @@ std::string formatTime(int64_t seconds, uint32_t nanoseconds) {
 void writeText(std::ostream &stream, uint64_t index, const std::string &hex, const MessageResult &r,
                const TextOptions &options, const CaptureOrigin *origin) {
     static thread_local Text os;
+    static thread_local FieldTree tree;
     os.s.clear();
-    if (origin != nullptr) {
-        const capture::TcapMessage &c = origin->carrier;
-        os << "frame " << origin->frame << " at " << formatTime(origin->seconds, origin->nanoseconds);
-        if (c.hasPointCodes)
-            os << ": opc " << c.opc << ", dpc " << c.dpc;
-        else
-            os << ": no point codes";
-        os << ", called SSN ";
-        if (c.hasCalledSsn)
-            os << unsigned(c.calledSsn);
-        else
-            os << '-';
-        os << ", calling SSN ";
-        if (c.hasCallingSsn)
-            os << unsigned(c.callingSsn);
-        else
-            os << '-';
-        os << '\n';
-    }
+    if (origin != nullptr)
+        writeOrigin(os, *origin, options.time);
     os << "message " << index << ": " << hex << '\n';
     if (r.md) {
-        for (const DecodedOut &f : r.md->fields) {
-            os << f.text;
-            if (options.spans) {
-                os << ' ';
-                for (const SpanOut &s : f.spans)
-                    os << " [" << s.first << '-' << s.last << "]=" << s.value;
+        if (options.fields == FieldsMode::List) {
+            for (const DecodedOut &f : r.md->fields) {
+                os << f.text;
+                if (options.spans)
+                    writeSpans(os, f);
+                os << '\n';
             }
-            os << '\n';
+        } else {
+            tree.write(os, *r.md, options);
+            if (r.md->errorFlags != 0 && r.md->result == 1)
+                os << "errors: " << describeErrorFlags(r.md->errorFlags) << '\n';
         }
         writeFailure(os, "md", *r.md);
     }
