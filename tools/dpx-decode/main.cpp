@@ -17,16 +17,16 @@
 #include <string>
 #include <vector>
 
-#include "hex_line.h"
-#include "input.h"
+#include "input/hex_line.h"
+#include "input/input.h"
 #include "module.h"
-#include "output.h"
-#include "summary.h"
 #include "dialogues/tracker.h"
 #include "filter/match.h"
 #include "views/dialogue_view.h"
 #include "views/flow_svg.h"
+#include "views/output.h"
 #include "views/srt_stats.h"
+#include "views/summary.h"
 
 namespace {
 

@@ -4,7 +4,7 @@
 
 #include <ostream>
 
-#include "output.h"
+#include "views/output.h"
 
 namespace dpxdecode::views {
 namespace {
