@@ -128,7 +128,7 @@ int main(int argc, char **argv) {
     app.add_flag("--dialogues", dialoguesView, "messages grouped into TCAP dialogues");
     app.add_option("--dialogue-timeout", dialogueTimeout,
                    "seconds of capture time after which a silent dialogue is written out as open (default 60)")
-        ->check(CLI::PositiveNumber);
+        ->check(CLI::Range(0.001, 1e9));
     app.add_option("--flow", flowFile, "write a call-flow picture (SVG) of the dialogues to this file");
 
     // "--stats srt" names what --stats counts; "--stats FILE" is the flag and a file.
