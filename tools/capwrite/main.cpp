@@ -67,12 +67,25 @@ unsigned long number(const std::string &s, unsigned long max) {
     return v;
 }
 
+// "SECONDS[.FRACTION]" to nanoseconds, exactly: a time stamp read through a
+// double would be off by a microsecond for many fractions.
 std::uint64_t seconds(const std::string &s) {
-    char *end = nullptr;
-    const double v = std::strtod(s.c_str(), &end);
-    if (s.empty() || *end || !(v >= 0) || v > 4e9)
+    const std::size_t dot = s.find('.');
+    const std::string whole = s.substr(0, dot);
+    const std::string fraction = dot == std::string::npos ? std::string() : s.substr(dot + 1);
+    const auto digits = [](const std::string &d) {
+        return d.find_first_not_of("0123456789") == std::string::npos;
+    };
+    if (whole.empty() || whole.size() > 10 || !digits(whole) || !digits(fraction) || fraction.size() > 9 ||
+        (dot != std::string::npos && fraction.empty()))
         throw UsageError("bad time '" + s + "'");
-    return static_cast<std::uint64_t>(v * 1e9 + 0.5);
+    const std::uint64_t secs = std::stoull(whole);
+    if (secs > 4000000000ull)
+        throw UsageError("bad time '" + s + "'");
+    std::uint64_t ns = 0;
+    for (std::size_t i = 0; i < 9; ++i)
+        ns = ns * 10 + (i < fraction.size() ? std::uint64_t(fraction[i] - '0') : 0);
+    return secs * 1000000000ull + ns;
 }
 
 struct Settings {

@@ -10,6 +10,8 @@
 #include <CLI/CLI.hpp>
 #include <unistd.h>
 
+#include <algorithm>
+#include <fstream>
 #include <iostream>
 #include <optional>
 #include <string>
@@ -18,8 +20,13 @@
 #include "input/hex_line.h"
 #include "input/input.h"
 #include "module.h"
+#include "dialogues/tracker.h"
+#include "filter/match.h"
 #include "views/ek_output.h"
+#include "views/dialogue_view.h"
+#include "views/flow_svg.h"
 #include "views/output.h"
+#include "views/srt_stats.h"
 #include "views/summary.h"
 
 namespace {
@@ -88,11 +95,15 @@ int main(int argc, char **argv) {
     std::string ssnList = "146";
     bool spans = false;
     bool summary = false;
-    bool stats = false;
     bool ansi = false;
     std::string fieldsMode = "values";
     std::string timeFormat = "utc";
     bool version = false;
+    std::vector<std::string> statsKinds;
+    std::vector<std::string> matchExpressions;
+    bool dialoguesView = false;
+    double dialogueTimeout = 60;
+    std::string flowFile;
 
     app.add_option("files", files, "files of hex messages or captures ('-' is standard input)");
     app.add_option("--hex", hexArgs, "a message in hex (repeatable)")->allow_extra_args(false);
@@ -118,10 +129,33 @@ int main(int argc, char **argv) {
                    "captures: take SCCP messages whose called or calling SSN is in this list (default 146)");
     app.add_flag("--ansi", ansi, "captures: ANSI MTP3 routing labels and SCCP addresses");
     app.add_flag("--summary", summary, "one line per message instead of the passes' output");
-    app.add_flag("--stats", stats, "counts by message type, operation, result, error, flag and skip reason");
+    app.add_flag("--stats{messages}", statsKinds,
+                 "counts by message type, operation, result, error, flag and skip reason; "
+                 "--stats srt: response times, dialogue durations and counts per operation, error, "
+                 "release cause, event type and service key")
+        ->check(CLI::IsMember({"messages", "srt"}));
+    app.add_option("--match", matchExpressions,
+                   "only messages (with --dialogues, --stats srt or --flow: dialogues with a message) where "
+                   "NAME=VALUE or NAME~PREFIX holds; repeatable, all must hold")
+        ->allow_extra_args(false);
+    app.add_flag("--dialogues", dialoguesView, "messages grouped into TCAP dialogues");
+    app.add_option("--dialogue-timeout", dialogueTimeout,
+                   "seconds of capture time after which a silent dialogue is written out as open (default 60)")
+        ->check(CLI::Range(0.001, 1e9));
+    app.add_option("--flow", flowFile, "write a call-flow picture (SVG) of the dialogues to this file");
 
+    // "--stats srt" names what --stats counts; "--stats FILE" is the flag and a file.
+    std::vector<std::string> args(argv + std::min(argc, 1), argv + argc);
+    for (size_t i = 0; i + 1 < args.size(); ++i)
+        if (args[i] == "--stats" && args[i + 1] == "srt") {
+            args[i] = "--stats=srt";
+            args.erase(args.begin() + long(i) + 1);
+        }
+    std::reverse(args.begin(), args.end()); // CLI11 takes the arguments last first
+    if (argc > 0)
+        app.name(argv[0]);
     try {
-        app.parse(argc, argv);
+        app.parse(args);
     } catch (const CLI::ParseError &e) {
         const int rc = app.exit(e);
         return rc == 0 ? 0 : kExitUsage;
@@ -133,8 +167,26 @@ int main(int argc, char **argv) {
         return kExitUsage;
     }
     inputOptions.progress = isatty(STDERR_FILENO) == 1;
-    if (format == "ek" && (summary || stats || passOption->count() > 0)) {
-        std::cerr << "dpx-decode: --format ek writes bulk-index documents only: no --summary, --stats or --pass\n";
+    const bool stats = std::find(statsKinds.begin(), statsKinds.end(), "messages") != statsKinds.end();
+    const bool srt = std::find(statsKinds.begin(), statsKinds.end(), "srt") != statsKinds.end();
+    dpxdecode::MessageFilter filter;
+    std::string filterError;
+    if (!filter.parse(matchExpressions, filterError)) {
+        std::cerr << "dpx-decode: " << filterError << '\n';
+        return kExitUsage;
+    }
+    // Following calls: dialogues, response times or the picture.
+    const bool follow = dialoguesView || srt || !flowFile.empty();
+    std::ofstream flowOut;
+    if (!flowFile.empty()) {
+        flowOut.open(flowFile, std::ios::binary);
+        if (!flowOut) {
+            std::cerr << "dpx-decode: --flow: cannot write " << flowFile << '\n';
+            return kExitUsage;
+        }
+    }
+    if (format == "ek" && (summary || stats || follow || passOption->count() > 0)) {
+        std::cerr << "dpx-decode: --format ek writes bulk-index documents only: no --summary, --stats, --pass, --dialogues or --flow\n";
         return kExitUsage;
     }
 
@@ -167,17 +219,20 @@ int main(int argc, char **argv) {
     // passes named with --pass.  The summary, the statistics and the
     // bulk-index documents are made from the decoded-field and key-field
     // passes: those run for them even when their output is not wanted.
+    // Filters and the dialogue views read the decoded and key fields too.
     const bool json = format == "json";
     const bool ek = format == "ek";
     const bool named = passOption->count() > 0;
     dpxdecode::PassSelection passes = selectPasses(passNames);
     if (!named && !json)
-        passes = dpxdecode::PassSelection{!summary && !ek, false, false, false};
+        passes = dpxdecode::PassSelection{!summary && !ek && !follow, false, false, false};
     const bool showMd = passes.md;
-    const bool passOutput = !ek && (!summary || named) && (passes.md || passes.display || passes.view || passes.keys);
+    const bool showKeys = passes.keys;
+    const bool passOutput =
+        !ek && ((!summary && !follow) || named) && (passes.md || passes.display || passes.view || passes.keys);
     dpxdecode::PassSelection run = passes;
-    run.md |= summary || stats || ek;
-    run.keys |= ek;
+    run.md |= summary || stats || ek || follow || !filter.empty();
+    run.keys |= ek || follow || !filter.empty();
 
     dpxdecode::TimeFormatter time(timeFormat == "epoch"      ? dpxdecode::TimeFormat::Epoch
                                   : timeFormat == "relative" ? dpxdecode::TimeFormat::Relative
@@ -196,13 +251,45 @@ int main(int argc, char **argv) {
     }
     dpxdecode::MessageResult result;
     std::optional<dpxdecode::MdOut> hiddenMd;
+    std::optional<dpxdecode::KeysOut> hiddenKeys;
     dpxdecode::MessageSummary messageSummary;
     dpxdecode::Statistics statistics;
+    dpxdecode::dialogues::MessageFacts facts;
+    dpxdecode::views::ResponseTimes responseTimes;
+    dpxdecode::views::FlowPicture flow;
+    dpxdecode::dialogues::TrackerLimits limits;
+    limits.timeoutNs = static_cast<int64_t>(dialogueTimeout * 1e9);
+    dpxdecode::dialogues::DialogueTracker tracker(limits, [&](const dpxdecode::dialogues::Dialogue &d) {
+        if (!filter.empty() && !d.matched)
+            return;
+        if (dialoguesView) {
+            if (json)
+                dpxdecode::views::writeDialogueJson(std::cout, d);
+            else
+                dpxdecode::views::writeDialogueText(std::cout, d);
+        }
+        if (srt)
+            responseTimes.add(d);
+        if (flowOut.is_open())
+            flow.add(d);
+    });
 
     const dpxdecode::InputReport report = dpxdecode::readMessages(
         hexArgs, files, inputOptions,
         [&](const dpxdecode::InputMessage &msg) {
             session.run(msg.bytes.data(), msg.bytes.size(), run, result);
+            bool selected = true;
+            if (follow || !filter.empty()) {
+                dpxdecode::dialogues::extractFacts(index, msg.bytes.data(), msg.bytes.size(), result, msg.capture,
+                                                   facts);
+                selected = filter.matches(facts, result.md ? &*result.md : nullptr);
+                if (follow)
+                    tracker.add(facts, selected && !filter.empty());
+            }
+            if (!selected) {
+                ++index;
+                return;
+            }
             if (summary || stats || ek) {
                 dpxdecode::summarize(*result.md, messageSummary);
                 if (ek)
@@ -218,6 +305,8 @@ int main(int argc, char **argv) {
                 // statistics are set aside while the message is written.
                 if (!showMd)
                     hiddenMd.swap(result.md);
+                if (!showKeys)
+                    hiddenKeys.swap(result.keys);
                 const std::string hex = dpxdecode::toHex(msg.bytes);
                 if (json)
                     dpxdecode::writeJson(std::cout, index, hex, result, msg.capture);
@@ -225,13 +314,30 @@ int main(int argc, char **argv) {
                     dpxdecode::writeText(std::cout, index, hex, result, textOptions, msg.capture);
                 if (!showMd)
                     hiddenMd.swap(result.md);
+                if (!showKeys)
+                    hiddenKeys.swap(result.keys);
             }
             ++index;
         },
         std::cerr);
 
+    if (follow)
+        tracker.finish();
     if (stats)
         statistics.write(std::cout, report, json);
+    if (srt)
+        responseTimes.write(std::cout, json);
+    if (flowOut.is_open()) {
+        flow.write(flowOut);
+        flowOut.close();
+        if (!flowOut) {
+            std::cerr << "dpx-decode: --flow: cannot write " << flowFile << '\n';
+            return kExitBadInput;
+        }
+        if (flow.omitted() != 0)
+            std::cerr << "dpx-decode: --flow: " << flow.omitted() << " messages not drawn (the picture holds "
+                      << "at most 5000; narrow it with --match)\n";
+    }
     std::cout.flush();
     if (report.damagedCapture)
         return kExitDamagedCapture;
