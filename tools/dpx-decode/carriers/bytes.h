@@ -35,9 +35,12 @@ enum class Skip : uint8_t {
     Mtp2Truncated,
     Mtp2NotMsu,
     Ipv4Truncated,
-    Ipv4Fragment,
     Ipv6Truncated,
-    Ipv6Fragment,
+    IpFragmentDuplicate,
+    IpFragmentOverlap,
+    IpFragmentBeyondEnd,
+    IpFragmentIncomplete,
+    IpFragmentNoRoom,
     IpNotSctp,
     SctpTruncated,
     SctpChunkTruncated,
@@ -60,6 +63,7 @@ enum class Skip : uint8_t {
     SccpBadPointer,
     SccpUnsupportedType,
     SccpSsnNotSelected,
+    TcapNotCamel,
     SccpSegmentDropped,
     Count
 };
