@@ -77,9 +77,9 @@ bool namesCamelContext(Bytes dialoguePortion) {
            isCamelContext(oid.value);
 }
 
-uint64_t keyOf(uint32_t pointCode, uint32_t id, uint8_t length) {
-    // Never 0: a free entry's key.
-    return uint64_t(pointCode & 0xFFFFFF) << 35 | uint64_t(length) << 32 | id;
+uint64_t keyOf(uint32_t id, uint8_t length) {
+    // Never 0 (a free entry's key): the length is 1 to 4.
+    return uint64_t(length) << 32 | id;
 }
 
 } // namespace
@@ -166,22 +166,23 @@ size_t CamelDialogues::known() const {
     return n;
 }
 
-bool CamelDialogues::take(const TcapPeek &t, uint32_t opc, uint32_t dpc) {
+bool CamelDialogues::take(const TcapPeek &t, bool camelBySsn) {
+    const bool named = t.camelContext || camelBySsn;
     if (!t.ok)
-        return t.camelContext;
-    const uint64_t mine = t.hasOtid ? keyOf(opc, t.otid, t.otidLength) : 0;
-    const uint64_t theirs = t.hasDtid ? keyOf(dpc, t.dtid, t.dtidLength) : 0;
+        return named;
+    const uint64_t mine = t.hasOtid ? keyOf(t.otid, t.otidLength) : 0;
+    const uint64_t theirs = t.hasDtid ? keyOf(t.dtid, t.dtidLength) : 0;
     switch (t.type) {
     case tcaptype::kBegin:
         // A Begin that names another context reuses the id for a dialogue
         // that is not CAMEL.
-        if (t.camelContext)
+        if (named)
             insert(mine).peer = 0;
         else
             erase(mine);
-        return t.camelContext;
+        return named;
     case tcaptype::kContinue: {
-        if (!t.camelContext && find(theirs) == nullptr)
+        if (!named && find(theirs) == nullptr)
             return false;
         insert(mine).peer = theirs;
         insert(theirs).peer = mine;
@@ -190,7 +191,7 @@ bool CamelDialogues::take(const TcapPeek &t, uint32_t opc, uint32_t dpc) {
     case tcaptype::kEnd:
     case tcaptype::kAbort: {
         const Entry *e = find(theirs);
-        if (!t.camelContext && e == nullptr)
+        if (!named && e == nullptr)
             return false;
         if (e != nullptr && e->peer != 0)
             erase(e->peer);
@@ -198,7 +199,7 @@ bool CamelDialogues::take(const TcapPeek &t, uint32_t opc, uint32_t dpc) {
         return true;
     }
     default:
-        return t.camelContext;
+        return named;
     }
 }
 

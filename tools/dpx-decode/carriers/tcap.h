@@ -43,18 +43,20 @@ bool isCamelContext(Bytes oid);
 // The transaction ids of dialogues known to be CAMEL.  A Begin that names
 // a CAMEL context makes its dialogue known; Continue, End and Abort
 // belong to a known dialogue by their destination id (the id the receiver
-// gave), so both directions are followed; End and Abort forget it.  A
-// transaction id is a sender's: it is kept with the sender's point code.
-// Bounded: a fixed table where, when full, the entry used longest ago
-// gives way.
+// gave), so both directions are followed; End and Abort forget it.  Ids
+// are kept without point codes: one dialogue may be seen on links that
+// give different ones (an SCCP relay, SUA routed on global titles, two
+// probes).  Bounded: a fixed table where, when full, the entry used
+// longest ago gives way.
 class CamelDialogues {
 public:
     static constexpr size_t kSets = 4096;
     static constexpr size_t kWays = 4;
 
-    // Whether the message is CAMEL: it names a CAMEL context or belongs to
-    // a known dialogue.  Learns and forgets ids as it goes.
-    bool take(const TcapPeek &message, uint32_t opc, uint32_t dpc);
+    // Whether the message is CAMEL: it names a CAMEL context, belongs to a
+    // known dialogue, or `camelBySsn` (it went to or came from a CAMEL
+    // subsystem).  Learns and forgets ids as it goes.
+    bool take(const TcapPeek &message, bool camelBySsn = false);
     size_t known() const;
 
 private:

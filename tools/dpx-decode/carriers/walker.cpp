@@ -242,13 +242,14 @@ bool FrameWalker::listed(const TcapMessage &m) const {
 }
 
 bool FrameWalker::taken(const TcapMessage &m) {
-    if (listed(m))
-        return true;
+    const bool byList = listed(m);
     if (!options_.camelDialogues) {
-        count(Skip::SccpSsnNotSelected);
-        return false;
+        if (!byList)
+            count(Skip::SccpSsnNotSelected);
+        return byList;
     }
-    if (dialogues_.take(peekTcap(m.tcap), m.opc, m.dpc))
+    // Dialogues on SSN 146 are learnt too: they may go on on another SSN.
+    if (dialogues_.take(peekTcap(m.tcap), byList))
         return true;
     count(Skip::TcapNotCamel);
     return false;

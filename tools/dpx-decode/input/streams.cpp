@@ -198,13 +198,15 @@ private:
         ZSTD_inBuffer in{in_, inSize_, inPos_};
         ZSTD_outBuffer out{buf, n, produced};
         const size_t rc = ZSTD_decompressStream(z_, &out, &in);
+        const bool moved = in.pos != inPos_ || out.pos != produced;
         inPos_ = in.pos;
         produced = out.pos;
         if (ZSTD_isError(rc)) {
             fail(std::string("zstd: ") + ZSTD_getErrorName(rc));
             return false;
         }
-        frameEnded_ = rc == 0;
+        if (moved)
+            frameEnded_ = rc == 0;
         return true;
     }
     bool atBoundary() const override { return frameEnded_; }
@@ -233,7 +235,8 @@ private:
             fail(std::string("lz4: ") + LZ4F_getErrorName(rc));
             return false;
         }
-        frameEnded_ = rc == 0;
+        if (inSize != 0 || outSize != 0)
+            frameEnded_ = rc == 0;
         return true;
     }
     bool atBoundary() const override { return frameEnded_; }
