@@ -19,8 +19,8 @@
 #include "input/hex_line.h"
 #include "input/input.h"
 #include "module.h"
-#include "output.h"
-#include "summary.h"
+#include "views/output.h"
+#include "views/summary.h"
 
 namespace {
 
