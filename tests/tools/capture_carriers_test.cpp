@@ -194,7 +194,7 @@ TEST(CaptureCarriers, FramesWithoutCamelAreCountedByReason) {
         Bytes frame;
         cap::Skip why;
     } cases[] = {
-        {cap::linktype::kRaw, overIpv4(sctpData(ssn6, 3)), cap::Skip::SccpSsnNotSelected},
+        {cap::linktype::kRaw, overIpv4(sctpData(ssn6, 3)), cap::Skip::TcapNotCamel},
         {cap::linktype::kRaw, overIpv4(sctpData(aspUp, 3)), cap::Skip::M3uaNotData},
         {cap::linktype::kMtp3, isup, cap::Skip::Mtp3NotSccp},
         {cap::linktype::kMtp2, fisu, cap::Skip::Mtp2NotMsu},

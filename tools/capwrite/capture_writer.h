@@ -171,10 +171,10 @@ enum class FileFormat { Pcap, Pcapng };
 struct FileOptions {
     FileFormat format = FileFormat::Pcap;
     Link link = Link::Ethernet;
-    // pcapng: further interfaces (1, 2, ...) after the first, of `link`.
-    std::vector<Link> moreLinks;
     bool nanoseconds = false;   // nanosecond time stamps (pcap magic, pcapng if_tsresol)
     std::uint32_t snaplen = 0;  // 0: 262144; frames longer are cut to it
+    // pcapng: further interfaces (1, 2, ...) after the first, of `link`.
+    std::vector<Link> moreLinks;
 };
 
 // Writes frames to a stdio stream (not closed here).  Time stamps are in
