@@ -262,6 +262,9 @@ TEST(CaptureCamelDialogues, FollowedBothWaysByTheirTransactionIds) {
         {"the other way", tcapMessage(0x65, kA, kB, {}), 10, 10, true},
         {"End", tcapMessage(0x64, {}, kA, {}), 10, 10, true},
         {"the ids are forgotten", tcapMessage(0x65, kA, kB, {}), 10, 10, false},
+        {"a Continue is known by its own id too", tcapMessage(0x62, kA, {}, kCap4), 10, 10, true},
+        {"", tcapMessage(0x65, kA, otherB, {}), 10, 10, true},
+        {"", tcapMessage(0x67, {}, kA, {}), 10, 10, true},
         {"SSN 146 is CAMEL by its SSN", tcapMessage(0x62, otherA, {}, {}), 146, 146, true},
         {"and its dialogue goes on on SSN 12", tcapMessage(0x65, otherB, otherA, {}), 12, 12, true},
         {"Abort", tcapMessage(0x67, {}, otherB, {}), 12, 12, true},
@@ -281,8 +284,8 @@ TEST(CaptureCamelDialogues, FollowedBothWaysByTheirTransactionIds) {
             EXPECT_EQ(found, (byDialogue ? m.taken : m.called == 146) ? 1u : 0u);
         }
         const cap::Skip why = byDialogue ? cap::Skip::TcapNotCamel : cap::Skip::SccpSsnNotSelected;
-        EXPECT_EQ(walker.skips()[size_t(why)], byDialogue ? 3u : 10u);
-        EXPECT_EQ(walker.sccpCounts().byCalledSsn[10], 5u);
+        EXPECT_EQ(walker.skips()[size_t(why)], byDialogue ? 3u : 13u);
+        EXPECT_EQ(walker.sccpCounts().byCalledSsn[10], 8u);
         EXPECT_EQ(walker.sccpCounts().byCalledSsn[6] + walker.sccpCounts().byCalledSsn[7], 2u);
     }
 }

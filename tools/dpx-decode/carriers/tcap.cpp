@@ -182,7 +182,9 @@ bool CamelDialogues::take(const TcapPeek &t, bool camelBySsn) {
             erase(mine);
         return named;
     case tcaptype::kContinue: {
-        if (!named && find(theirs) == nullptr)
+        // Either id will do: the message that told the other one may have
+        // been lost to the capture.
+        if (!named && find(theirs) == nullptr && find(mine) == nullptr)
             return false;
         insert(mine).peer = theirs;
         insert(theirs).peer = mine;

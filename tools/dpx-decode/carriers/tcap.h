@@ -43,7 +43,8 @@ bool isCamelContext(Bytes oid);
 // The transaction ids of dialogues known to be CAMEL.  A Begin that names
 // a CAMEL context makes its dialogue known; Continue, End and Abort
 // belong to a known dialogue by their destination id (the id the receiver
-// gave), so both directions are followed; End and Abort forget it.  Ids
+// gave), so both directions are followed, and a Continue by its
+// originating id too; End and Abort forget it.  Ids
 // are kept without point codes: one dialogue may be seen on links that
 // give different ones (an SCCP relay, SUA routed on global titles, two
 // probes).  Bounded: a fixed table where, when full, the entry used
