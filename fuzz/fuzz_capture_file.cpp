@@ -8,6 +8,7 @@
 // past its data; a frame longer than the reader's limit, or frame numbers
 // out of step, abort.
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
