@@ -44,7 +44,8 @@ bool CaptureReader::fill(size_t n, bool &ended) {
     if (end_ - pos_ >= n)
         return true;
     if (buf_.size() - pos_ < n) {
-        std::memmove(buf_.data(), buf_.data() + pos_, end_ - pos_);
+        if (end_ != pos_)
+            std::memmove(buf_.data(), buf_.data() + pos_, end_ - pos_);
         end_ -= pos_;
         pos_ = 0;
         if (buf_.size() < n)
