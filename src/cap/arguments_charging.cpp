@@ -69,9 +69,9 @@ constexpr Member kCallGapArg[] = {sequence("Call Gap", 1084, 1085, kCallGapLoop)
 // ---- Furnish Charging Information (34): an OCTET STRING holding the billing data ----------------
 
 constexpr Member kFciBillingCharging[] = {
-    el(0x80, "Free Format Data", 2186, 2187, halfOctets(2188, 52)),
+    freeFormatData(0x80),
     sendingSideId(0xA1),
-    el(0x82, "Append freee FORMAT data", 2189, 2190, CAMEL_UNIT(decodeAppendFreeFormatData)),
+    appendFreeFormatData(0x82),
 };
 constexpr MemberTable kFciBillingChargingLoop = members(Walk::Loop, kFciBillingCharging);
 constexpr Member kFciBillingChargingCharacteristics[] = {
