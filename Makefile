@@ -18,7 +18,7 @@ SHELL := /bin/bash
 
 PRESETS := native asan m32
 DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
-                libbenchmark-dev nlohmann-json3-dev libcli11-dev libpcap-dev tshark \
+                libbenchmark-dev nlohmann-json3-dev libcli11-dev zlib1g-dev libzstd-dev liblz4-dev tshark \
                 python3
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 APT_INSTALL := $(SUDO) apt-get update -qq; \
@@ -133,7 +133,7 @@ FUZZ_PACKAGES := clang libclang-rt-14-dev
 FUZZ_TIME ?= 300
 FUZZ_ARGS ?= -max_len=512 -dict=fuzz/camel.dict
 
-.PHONY: fuzz fuzz-capture fuzz-tools
+.PHONY: fuzz fuzz-capture fuzz-capture-file fuzz-ip-fragments fuzz-tools
 fuzz: fuzz-tools
 	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
 	    $(FUZZ_ARGS) build/fuzz/corpus build/fuzz/seeds fuzz/corpus
@@ -144,6 +144,19 @@ fuzz-capture: fuzz-tools
 	mkdir -p build/fuzz/capture-corpus
 	build/fuzz/capture_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
 	    -max_len=4096 build/fuzz/capture-corpus build/fuzz/capture-seeds
+
+# make fuzz-capture-file: capture_file_fuzz, the capture reader and the
+# decompressors, seeded with the sample captures as they are.
+fuzz-capture-file: fuzz-tools
+	mkdir -p build/fuzz/capture-file-corpus
+	build/fuzz/capture_file_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
+	    -max_len=16384 build/fuzz/capture-file-corpus samples
+
+# make fuzz-ip-fragments: ip_fragments_fuzz, IP reassembly.
+fuzz-ip-fragments: fuzz-tools
+	mkdir -p build/fuzz/ip-fragments-corpus
+	build/fuzz/ip_fragments_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
+	    -max_len=4096 build/fuzz/ip-fragments-corpus
 
 fuzz-tools: deps
 	@missing=""; \

@@ -1,5 +1,5 @@
-// libFuzzer target over dpx-decode's frame walker: link layer, IP, SCTP
-// (with duplicate and fragment state), SIGTRAN adaptations, MTP2, MTP3 and
+// libFuzzer target over dpx-decode's frame walker: link layer, IP (with
+// fragment state), SCTP (with duplicate and fragment state), SIGTRAN adaptations, MTP2, MTP3 and
 // SCCP (with XUDT segment state) down to the TCAP message.
 //
 // Input: a link-type octet (an index into kLinkTypes), an option octet, then
@@ -12,8 +12,9 @@
 // Option octet:
 //   bit 0  ANSI routing labels and SCCP addresses
 //   bit 1  every SSN is selected (not only 146)
-//   bit 2  tight reassembly limits (a few flows, small messages), so the
-//          eviction and drop paths run
+//   bit 2  tight reassembly limits (a few flows, small messages, short
+//          fragment time-outs), so the eviction and drop paths run
+//   bit 3  only the selected SSNs (no CAMEL dialogues on other SSNs)
 //
 // Every TCAP message found is read in full, must be no longer than the
 // largest message the limits allow, and the walker's count of messages
@@ -74,7 +75,11 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
         o.sctp.tsnWindow = 64;
         o.sccp.messages = 2;
         o.sccp.messageBytes = 64;
+        o.ip.datagrams = 2;
+        o.ip.pendingBytes = 256;
+        o.ip.timeoutFrames = 3;
     }
+    o.camelDialogues = (option & 8) == 0;
     const size_t largestAllowed = std::max<size_t>(o.sctp.messageBytes, 0xFFFF);
     cap::FrameWalker walker(o);
     Sink sink;
@@ -94,6 +99,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
         if (found != sink.messages - before)
             fail("message count differs from the messages handed out");
     }
+    walker.endCapture();
     if (sink.largest > largestAllowed)
         fail("a message longer than the reassembly limits allow");
     return 0;

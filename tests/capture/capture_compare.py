@@ -5,12 +5,25 @@ Decodes the sample captures (samples/*.pcap, samples/*.pcapng) and a
 generated set of captures - a few thousand call-flow messages
 (tools/capwrite/callflow.py) spread over every link type and SIGTRAN
 adaptation capwrite writes, with SCTP bundling and fragmentation, XUDT
-segments, LUDT, VLAN tags, IPv6 and IPv4 options, and some TCAP messages
-between other subsystems (not CAMEL) - with `dpx-decode --format json
---pass md` and with tshark (-T pdml), and checks that both find the same
+segments, LUDT, VLAN tags, IPv6 and IPv4 options, some messages of the
+call flows on other subsystems; a pcapng whose interfaces have different
+link types (Ethernet, SLL, raw IP, MTP3), gzip-compressed captures, IPv4
+and IPv6 fragments (in order, reversed, overlapping, duplicated, missing),
+CAMEL on SSN 10, and a capture with no CAMEL at all (TCAP without a
+dialogue portion on SSN 6 and 7) - with `dpx-decode --format json --pass
+md` and with tshark (-T pdml), and checks that both find the same
 messages: for each, the frame number, the originating and destination
 transaction ids and the operation code of each Invoke.  tshark's TCAP
-messages count when the called or the calling SSN is 146.
+messages count when the called or the calling SSN is 146, when tshark
+decodes them as CAMEL (on any SSN, by their dialogue), and when one of
+their transaction ids was seen on such a message before (an End without
+components, say).  tshark decodes some messages of a dialogue on another
+SSN as something else (GSM MAP on SSN 6 and 7) or as no application at
+all: for those the frame and the transaction ids are compared, not the
+operations.
+
+dpx-decode must exit with status 4 on the capture without CAMEL (and on
+any capture where neither finds a message), 0 on the others.
 
 Exit status: 0 both agree, 1 they differ or dpx-decode failed, 77 skipped
 (tshark or the reference tools ../shared/tools are missing).  Python 3
@@ -30,6 +43,7 @@ from collections import Counter
 from pathlib import Path
 
 SKIP = 77
+NO_CAMEL_STATUS = 4
 ROOT = Path(__file__).resolve().parents[2]
 CAMEL_SSN = 146
 F_OTID, F_DTID, F_OPCODE = 3653, 3656, 1066
@@ -60,20 +74,37 @@ GENERATED = [
     ('mtp2.pcap', ['--link', 'mtp2'], [''], [''], SCCP_VARIANTS),
     ('mtp2-phdr.pcapng', ['--link', 'mtp2-phdr'], [''], [''], SCCP_VARIANTS),
     ('mtp3.pcap', ['--link', 'mtp3'], ['--pc-in-address'], [''], SCCP_VARIANTS),
+    # Each message on one of four interfaces of different link types.
+    ('multi-interface.pcapng', ['--link', 'ethernet,sll,raw,mtp3'],
+     ['--interface 0 --sigtran m3ua --ipv4', '--interface 1 --sigtran m2ua --ipv6',
+      '--interface 2 --sigtran m3ua --ipv4', '--interface 3 --pc-in-address'], SCTP_VARIANTS, SCCP_VARIANTS),
+    ('multi-interface-gz.pcapng.gz', ['--link', 'mtp3,ethernet'],
+     ['--interface 0 --sigtran m3ua --pc-in-address', '--interface 1 --sigtran sua --ipv6'], SCTP_VARIANTS, ['']),
+    ('eth-m3ua-gz.pcap.gz', ['--link', 'ethernet'], ['--sigtran m3ua'], SCTP_VARIANTS, SCCP_VARIANTS),
+    ('ipv4-fragments.pcap', ['--link', 'ethernet'],
+     ['--sigtran m3ua --ip-fragment 64 --ip-fragment-order ' + o
+      for o in ('in', 'reverse', 'overlap', 'duplicate', 'missing')], SCTP_VARIANTS, SCCP_VARIANTS),
+    ('ipv6-fragments.pcapng', ['--link', 'sll'],
+     ['--sigtran m3ua --ipv6 --ip-options --ip-fragment 48 --ip-fragment-order ' + o
+      for o in ('in', 'reverse', 'overlap', 'duplicate', 'missing')], SCTP_VARIANTS, SCCP_VARIANTS),
 ]
-OTHER_SSN = '--called-ssn 6 --calling-ssn 7'   # HLR and VLR: not CAMEL
+OTHER_SSN = '--called-ssn 6 --calling-ssn 7'   # HLR and VLR
 CAMEL_SSNS = '--called-ssn 146 --calling-ssn 146'
+SSN10 = '--called-ssn 10 --calling-ssn 10'
+# Whole call flows on SSN 10: found by their CAMEL application contexts.
+SSN10_CAPTURE = ('ssn10-m3ua.pcap', ['--link', 'ethernet'], ['--sigtran m3ua'], SCTP_VARIANTS, SCCP_VARIANTS)
+NO_CAMEL_CAPTURE = 'no-camel.pcap'
 
 
 def message_key(frame, otid, dtid, ops):
-    return (int(frame), otid or '-', dtid or '-', tuple(ops))
+    return (int(frame), otid or '-', dtid or '-', None if ops is None else tuple(ops))
 
 
 # --------------------------------------------------------------------------
 # tshark
 # --------------------------------------------------------------------------
 def tshark_messages(tshark, capture):
-    """-> [(frame, otid, dtid, (opcode, ...))] for TCAP messages to or from SSN 146."""
+    """-> [(frame, otid, dtid, (opcode, ...) or None)] for the TCAP messages tshark finds CAMEL."""
     env = dict(os.environ, WIRESHARK_CONFIG_DIR=tempfile.mkdtemp(prefix='capcmp-ws-'))
     cmd = [tshark, '-n', '-r', str(capture), '-T', 'pdml']
     for p in TSHARK_PREFS:
@@ -81,10 +112,12 @@ def tshark_messages(tshark, capture):
     errors = tempfile.TemporaryFile()
     proc = subprocess.Popen(cmd, stdout=subprocess.PIPE, stderr=errors, env=env)
     out = []
+    camel_ids = set()
     for _, packet in ET.iterparse(proc.stdout):
         if packet.tag != 'packet':
             continue
         frame, ssns, msg = None, (), None
+        pending = []  # TCAP messages of the frame not on SSN 146: CAMEL or not, by what follows
         for proto in packet.findall('proto'):
             name = proto.get('name')
             if name == 'frame':
@@ -94,13 +127,24 @@ def tshark_messages(tshark, capture):
                         if f.get('name') in ('sccp.called.ssn', 'sccp.calling.ssn',
                                              'sua.source.ssn', 'sua.destination.ssn')}
             elif name == 'tcap':
-                msg = None
+                ids = {f.get('name'): f.get('value').lower() for f in proto.iter('field')
+                       if f.get('name') in ('tcap.otid', 'tcap.dtid')}
+                msg = [frame, ids.get('tcap.otid'), ids.get('tcap.dtid'), []]
                 if str(CAMEL_SSN) in ssns:
-                    ids = {f.get('name'): f.get('value').lower() for f in proto.iter('field')
-                           if f.get('name') in ('tcap.otid', 'tcap.dtid')}
-                    msg = [frame, ids.get('tcap.otid'), ids.get('tcap.dtid'), []]
                     out.append(msg)
+                    camel_ids.update(i for i in msg[1:3] if i)
+                elif msg[1] in camel_ids or msg[2] in camel_ids:
+                    msg[3] = None  # operations unknown unless a camel layer follows
+                    out.append(msg)
+                else:
+                    pending.append(msg)
             elif name == 'camel' and msg is not None:
+                if msg[3] is None:
+                    msg[3] = []
+                if pending and pending[-1] is msg:
+                    pending.pop()
+                    out.append(msg)
+                    camel_ids.update(i for i in msg[1:3] if i)
                 for inv in proto.iter('field'):
                     if inv.get('name') != 'camel.invoke_element':
                         continue
@@ -125,9 +169,13 @@ def after_eq(text):
 def our_messages(decoder, capture):
     proc = subprocess.run([decoder, '--format', 'json', '--pass', 'md', str(capture)],
                           capture_output=True, text=True)
-    if proc.returncode != 0:
-        raise RuntimeError('dpx-decode exit status %d on %s: %s'
-                           % (proc.returncode, capture, proc.stderr.strip()[:500]))
+    empty = not proc.stdout.strip()
+    if proc.returncode != (NO_CAMEL_STATUS if empty else 0):
+        raise RuntimeError('dpx-decode exit status %d on %s (%s): %s'
+                           % (proc.returncode, capture, 'no message' if empty else 'messages',
+                              proc.stderr.strip()[:500]))
+    if empty and 'no CAMEL message' not in proc.stderr:
+        raise RuntimeError('dpx-decode did not say that %s holds no CAMEL message' % capture)
     out = []
     for line in proc.stdout.splitlines():
         if not line.strip():
@@ -152,39 +200,88 @@ def our_messages(decoder, capture):
 # --------------------------------------------------------------------------
 # generated captures
 # --------------------------------------------------------------------------
+def without_dialogue(hexmsg):
+    """The TCAP message without its dialogue portion (definite lengths only), or None."""
+    b = bytes.fromhex(hexmsg)
+
+    def tlv(at):
+        n = b[at + 1]
+        if n == 0x80:
+            return None
+        if n < 0x80:
+            return at + 2, n
+        k = n & 0x7F
+        return at + 2 + k, int.from_bytes(b[at + 2:at + 2 + k], 'big')
+
+    def length(n):
+        return bytes([n]) if n < 0x80 else bytes([0x81, n]) if n < 0x100 else bytes([0x82]) + n.to_bytes(2, 'big')
+
+    head = tlv(0)
+    if head is None:
+        return None
+    start, n = head
+    body, at = b'', start
+    while at < start + n:
+        e = tlv(at)
+        if e is None:
+            return None
+        if b[at] != 0x6B:
+            body += b[at:e[0] + e[1]]
+        at = e[0] + e[1]
+    return (bytes([b[0]]) + length(len(body)) + body).hex()
+
+
+def write_capture(capwrite, outdir, name, file_opts, lines):
+    src = outdir / (name + '.hex')
+    src.write_text('\n'.join(lines) + '\n')
+    path = outdir / name
+    subprocess.run([capwrite] + file_opts + ['-o', str(path), str(src)], check=True)
+    return path
+
+
 def generate(capwrite, callflow, outdir, total, seed):
     rng = random.Random(seed)
     items = list(callflow.generate(callflow.load_capgen(), seed=seed, messages=total, overlap=20))
-    per = max(1, len(items) // len(GENERATED))
+    captures = [(g, None) for g in GENERATED] + [(SSN10_CAPTURE, SSN10)]
+    per = max(1, len(items) // len(captures))
     paths = []
-    for i, (name, file_opts, base, sctp, sccp) in enumerate(GENERATED):
-        chunk = items[i * per:(i + 1) * per] if i + 1 < len(GENERATED) else items[i * per:]
+    for i, ((name, file_opts, base, sctp, sccp), ssns) in enumerate(captures):
+        chunk = items[i * per:(i + 1) * per] if i + 1 < len(captures) else items[i * per:]
         lines = []
         for side, hexmsg, desc, call in chunk:
-            ssn = OTHER_SSN if rng.random() < 0.05 else CAMEL_SSNS
+            ssn = ssns or (OTHER_SSN if rng.random() < 0.05 else CAMEL_SSNS)
             lines.append('#@ --from %s %s %s %s %s' % (side, rng.choice(base), rng.choice(sctp),
                                                        rng.choice(sccp), ssn))
             lines.append('# call %d: %s' % (call, desc))
             lines.append(hexmsg)
-        src = outdir / (name + '.hex')
-        src.write_text('\n'.join(lines) + '\n')
-        path = outdir / name
-        subprocess.run([capwrite] + file_opts + ['-o', str(path), str(src)], check=True)
-        paths.append(path)
+        paths.append(write_capture(capwrite, outdir, name, file_opts, lines))
+    # TCAP between the HLR and the VLR, no dialogue portion: nothing CAMEL.
+    lines = ['#@ ' + OTHER_SSN]
+    for side, hexmsg, desc, call in items[:200]:
+        stripped = without_dialogue(hexmsg)
+        if stripped:
+            lines += ['#@ --from %s' % side, stripped]
+    paths.append(write_capture(capwrite, outdir, NO_CAMEL_CAPTURE, ['--link', 'ethernet'], lines))
     return paths
 
 
 def compare(name, ours, theirs, show=8):
+    # Where tshark did not decode the message as CAMEL, ours is compared
+    # without its operations.
+    unknown = {k[:3] for k in theirs if k[3] is None}
+    ours = [k[:3] + (None,) if k[:3] in unknown else k for k in ours]
     a, b = Counter(ours), Counter(theirs)
     only_ours, only_theirs = a - b, b - a
     if not only_ours and not only_theirs:
-        print('%-28s %5d messages agree' % (name, len(theirs)))
+        print('%-28s %5d messages agree%s' % (name, len(theirs), ' (%d without operations)' % len(unknown)
+                                              if unknown else ''))
         return True
     print('%-28s DIFFER: %d messages found by dpx-decode, %d by tshark; %d only ours, %d only tshark'
           % (name, len(ours), len(theirs), sum(only_ours.values()), sum(only_theirs.values())))
     for label, diff in (('only dpx-decode', only_ours), ('only tshark', only_theirs)):
         for key in sorted(diff)[:show]:
-            print('    %s: frame %d otid %s dtid %s operations %s' % ((label,) + key[:3] + (list(key[3]),)))
+            print('    %s: frame %d otid %s dtid %s operations %s'
+                  % ((label,) + key[:3] + ('not compared' if key[3] is None else list(key[3]),)))
     return False
 
 
@@ -227,6 +324,9 @@ def main(argv=None):
             continue
         total += len(theirs)
         ok = compare(cap.name, ours, theirs) and ok
+        if cap.name == NO_CAMEL_CAPTURE and theirs:
+            print('%-28s tshark finds CAMEL in the capture meant to hold none' % cap.name)
+            ok = False
     if not a.keep:
         shutil.rmtree(tmp, ignore_errors=True)
     print('capture_compare: %d captures, %d messages: %s'

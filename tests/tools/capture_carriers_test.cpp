@@ -183,7 +183,6 @@ TEST(CaptureCarriers, FramesWithoutCamelAreCountedByReason) {
     Bytes isup = cw::mtp3(kLabel, Bytes{1, 2, 3}, 5);
     Bytes fisu = cw::mtp2({}, 1, 1);
     Bytes udp = cw::ipv4(kIpA, kIpB, 17, Bytes(12, 0), 1);
-    Bytes fragment = cw::ipv4(kIpA, kIpB, cw::kIpProtoSctp, sctpData(m3uaUdt(), 3), 1, {}, 0, true);
     Bytes cr = cw::mtp3(kLabel, Bytes{0x01, 0, 0, 1, 2, 2, 0, 0});
     cw::DataChunk c;
     c.ppid = 46; // Diameter
@@ -195,12 +194,11 @@ TEST(CaptureCarriers, FramesWithoutCamelAreCountedByReason) {
         Bytes frame;
         cap::Skip why;
     } cases[] = {
-        {cap::linktype::kRaw, overIpv4(sctpData(ssn6, 3)), cap::Skip::SccpSsnNotSelected},
+        {cap::linktype::kRaw, overIpv4(sctpData(ssn6, 3)), cap::Skip::TcapNotCamel},
         {cap::linktype::kRaw, overIpv4(sctpData(aspUp, 3)), cap::Skip::M3uaNotData},
         {cap::linktype::kMtp3, isup, cap::Skip::Mtp3NotSccp},
         {cap::linktype::kMtp2, fisu, cap::Skip::Mtp2NotMsu},
         {cap::linktype::kRaw, udp, cap::Skip::IpNotSctp},
-        {cap::linktype::kRaw, fragment, cap::Skip::Ipv4Fragment},
         {cap::linktype::kMtp3, cr, cap::Skip::SccpUnsupportedType},
         {cap::linktype::kRaw, diameter, cap::Skip::SctpUnknownPayload},
         {cap::linktype::kRaw, sackOnly, cap::Skip::SctpNoData},

@@ -59,16 +59,12 @@ Bytes capture(const std::vector<Bytes> &messages, cw::FileFormat format = cw::Fi
         }
         frames.emplace_back(kStart + i * 1000000, frame);
     }
-    return cw::captureBytes({format, cw::Link::Ethernet, false, 0}, frames);
+    cw::FileOptions options;
+    options.format = format;
+    return cw::captureBytes(options, frames);
 }
 
-class DpxDecodeCapture : public ::testing::Test {
-protected:
-    void SetUp() override {
-        if (!DPX_HAVE_PCAP)
-            GTEST_SKIP() << "dpx-decode built without libpcap";
-    }
-};
+class DpxDecodeCapture : public ::testing::Test {};
 
 TEST_F(DpxDecodeCapture, JsonAndTextSayWhereEachMessageCameFrom) {
     for (const cw::FileFormat format : {cw::FileFormat::Pcap, cw::FileFormat::Pcapng}) {
@@ -132,12 +128,21 @@ TEST_F(DpxDecodeCapture, SummaryAndStatistics) {
     EXPECT_EQ(stats["messageTypes"], json::parse(R"({"Begin":1,"End":1})"));
 }
 
-TEST_F(DpxDecodeCapture, CaptureWithoutCamelTrafficDecodesNothing) {
-    const std::string file = tempFile("arp", capture({{}, {}}));
-    const Outcome r = run(quote(file));
-    EXPECT_EQ(r.status, 0) << r.err;
+TEST_F(DpxDecodeCapture, CaptureWithoutCamelSaysWhatItHoldsAndExitsWithFour) {
+    const std::string arp = tempFile("arp", capture({{}, {}}));
+    const Outcome r = run(quote(arp));
+    EXPECT_EQ(r.status, 4) << r.err;
     EXPECT_EQ(r.out, "");
-    EXPECT_EQ(r.err, "");
+    EXPECT_EQ(r.err, "dpx-decode: " + arp + ": no CAMEL message in 2 frames\n" + "dpx-decode: " + arp +
+                         ":   skipped: link: neither IP nor SS7: 2\n");
+    // SCCP messages to SSN 146, but --ssn takes only 7.
+    const std::string flow = tempFile("flow", capture({kBegin, kEnd}));
+    const Outcome s = run("--ssn 7 " + quote(flow));
+    EXPECT_EQ(s.status, 4) << s.err;
+    EXPECT_NE(s.err.find(":   2 SCCP messages: 2 to SSN 146; taken: SSN 7 only\n"), std::string::npos) << s.err;
+    // One capture with CAMEL and one without: the status still says so.
+    EXPECT_EQ(run(quote(flow) + " " + quote(arp)).status, 4);
+    EXPECT_EQ(run(quote(flow)).status, 0);
 }
 
 TEST_F(DpxDecodeCapture, DamagedCaptureDecodesTheFramesBeforeAndExitsWithThree) {

@@ -222,8 +222,6 @@ TEST(DpxDecodeViews, TreesShowWhatTheDecodedFieldPassReported) {
 }
 
 TEST(DpxDecodeViews, SummaryNamesErrorsSubscribersAndTimes) {
-    if (!DPX_HAVE_PCAP)
-        GTEST_SKIP() << "dpx-decode built without libpcap";
     const Outcome r = run("--summary " + quote(kCapture));
     ASSERT_EQ(r.status, 0) << r.err;
     const Lines l = r.lines();
@@ -274,7 +272,7 @@ TEST(DpxDecodeViews, SummaryNamesErrorsSubscribersAndTimes) {
 // Every key entry's text against the decoded-field pass: digits and
 // transaction ids as the field shows them, codes as the field's number.
 TEST(DpxDecodeViews, KeyTextsAndBulkDocumentsCarryTheKeyFieldValues) {
-    const std::string files = allSampleFiles() + (DPX_HAVE_PCAP ? quote(kCapture) : "");
+    const std::string files = allSampleFiles() + quote(kCapture);
     const Outcome js = run("--format json --pass md,keys " + files);
     const Outcome ek = run("--format ek " + files);
     ASSERT_EQ(js.status, 0) << js.err;
@@ -334,8 +332,6 @@ TEST(DpxDecodeViews, KeyTextsAndBulkDocumentsCarryTheKeyFieldValues) {
 }
 
 TEST(DpxDecodeViews, BulkDocumentOfACallFlowMessage) {
-    if (!DPX_HAVE_PCAP)
-        GTEST_SKIP() << "dpx-decode built without libpcap";
     const Outcome r = run("--format ek " + quote(kCapture));
     ASSERT_EQ(r.status, 0) << r.err;
     const Lines l = r.lines();

@@ -339,17 +339,25 @@ Bytes ipv4(Ipv4Address src, Ipv4Address dst, std::uint8_t proto, View payload, s
     return b;
 }
 
-Bytes ipv6(const Ipv6Address &src, const Ipv6Address &dst, std::uint8_t proto, View payload, bool hopByHop) {
-    const std::size_t extLen = hopByHop ? 8 : 0;
+Bytes ipv6(const Ipv6Address &src, const Ipv6Address &dst, std::uint8_t proto, View payload, bool hopByHop,
+           const Ipv6Fragment *fragment) {
+    constexpr std::uint8_t kFragmentHeader = 44;
+    const std::size_t extLen = (hopByHop ? 8 : 0) + (fragment ? 8 : 0);
     checkFits(extLen + payload.size(), 65535, "IPv6 payload");
+    const std::uint8_t afterHopByHop = fragment ? kFragmentHeader : proto;
     Bytes b{0x60, 0, 0, 0};
     put16(b, static_cast<unsigned>(extLen + payload.size()));
-    put8(b, hopByHop ? 0 : proto);
+    put8(b, hopByHop ? 0 : afterHopByHop);
     put8(b, 64);
     append(b, src.b);
     append(b, dst.b);
     if (hopByHop) // next header, length 0 (8 octets), PadN of 4 octets
-        append(b, Bytes{proto, 0, 1, 4, 0, 0, 0, 0});
+        append(b, Bytes{afterHopByHop, 0, 1, 4, 0, 0, 0, 0});
+    if (fragment) { // next header, reserved, offset and M flag, identification
+        append(b, Bytes{proto, 0});
+        put16(b, static_cast<unsigned>((fragment->offset & 0xFFF8) | (fragment->more ? 1 : 0)));
+        put32(b, fragment->id);
+    }
     append(b, payload);
     return b;
 }
@@ -423,25 +431,31 @@ CaptureFile::CaptureFile(std::FILE *out, const FileOptions &o)
         put32le(h, 0xFFFFFFFF);
         put32le(h, 0xFFFFFFFF);
         put32le(h, 28);
-        // Interface description; if_tsresol 9 for nanoseconds (default: microseconds).
-        const std::uint32_t idbLen = o.nanoseconds ? 32 : 20;
-        put32le(h, 1);
-        put32le(h, idbLen);
-        put16le(h, static_cast<unsigned>(o.link));
-        put16le(h, 0);
-        put32le(h, snaplen_);
-        if (o.nanoseconds) {
-            put16le(h, 9);
-            put16le(h, 1);
-            append(h, Bytes{9, 0, 0, 0});
-            put32le(h, 0); // end of options
+        // Interface descriptions; if_tsresol 9 for nanoseconds (default: microseconds).
+        for (std::size_t i = 0; i < interfaces(); ++i) {
+            const std::uint32_t idbLen = o.nanoseconds ? 32 : 20;
+            put32le(h, 1);
+            put32le(h, idbLen);
+            put16le(h, static_cast<unsigned>(link(i)));
+            put16le(h, 0);
+            put32le(h, snaplen_);
+            if (o.nanoseconds) {
+                put16le(h, 9);
+                put16le(h, 1);
+                append(h, Bytes{9, 0, 0, 0});
+                put32le(h, 0); // end of options
+            }
+            put32le(h, idbLen);
         }
-        put32le(h, idbLen);
     }
+    if (o.format == FileFormat::Pcap && !o.moreLinks.empty())
+        throw CarrierError("a pcap file has one link type: several interfaces need pcapng");
     put(h);
 }
 
-void CaptureFile::frame(std::uint64_t timeNs, View data) {
+void CaptureFile::frame(std::uint64_t timeNs, View data, std::size_t interface) {
+    if (interface >= interfaces())
+        throw CarrierError("no interface " + std::to_string(interface) + " in this capture");
     const auto captured = static_cast<std::uint32_t>(std::min<std::size_t>(data.size(), snaplen_));
     const auto original = static_cast<std::uint32_t>(data.size());
     Bytes h;
@@ -456,7 +470,7 @@ void CaptureFile::frame(std::uint64_t timeNs, View data) {
         const std::uint32_t padded = (captured + 3) & ~3u;
         put32le(h, 6);
         put32le(h, 32 + padded);
-        put32le(h, 0); // interface
+        put32le(h, static_cast<std::uint32_t>(interface));
         put32le(h, static_cast<std::uint32_t>(ts >> 32));
         put32le(h, static_cast<std::uint32_t>(ts));
         put32le(h, captured);
@@ -507,7 +521,8 @@ const std::uint8_t kRouterAlert[] = {0x94, 0x04, 0x00, 0x00};
 // Chunks share an SCTP packet only when they travel the same way.
 bool samePath(const Carrier &x, const Carrier &y) {
     return x.reverse == y.reverse && x.vlans == y.vlans && x.ipv6 == y.ipv6 && x.ipOptions == y.ipOptions &&
-           x.adaptation == y.adaptation && x.portA == y.portA && x.portB == y.portB;
+           x.adaptation == y.adaptation && x.portA == y.portA && x.portB == y.portB && x.interface == y.interface &&
+           x.ipFragment == y.ipFragment && x.fragmentOrder == y.fragmentOrder;
 }
 
 bool isMtpLink(Link l) { return l == Link::Mtp2 || l == Link::Mtp2WithPhdr || l == Link::Mtp3; }
@@ -545,7 +560,7 @@ std::vector<Bytes> FlowWriter::userMessages(View tcap, const Carrier &c) {
     RoutingLabel label = c.label;
     if (b)
         std::swap(label.opc, label.dpc);
-    const bool mtpLink = isMtpLink(file_.options().link);
+    const bool mtpLink = isMtpLink(file_.link(c.interface));
     if (c.adaptation == Adaptation::Sua) {
         if (mtpLink)
             throw CarrierError("SUA needs an IP link type");
@@ -587,7 +602,7 @@ void FlowWriter::message(View tcap, const Carrier &c) {
     if (!pending_.empty() && !samePath(c, pendingCarrier_))
         flush();
     std::vector<Bytes> units = userMessages(tcap, c);
-    const Link link = file_.options().link;
+    const Link link = file_.link(c.interface);
     ++messages_;
     if (isMtpLink(link)) {
         Side &side = side_[c.reverse];
@@ -601,7 +616,7 @@ void FlowWriter::message(View tcap, const Carrier &c) {
                 append(frame, mtp2(msu, side.fsn, static_cast<std::uint8_t>(side_[!c.reverse].fsn - 1))); // BSN: the peer's last
                 side.fsn = (side.fsn + 1) & 0x7F;
             }
-            emit(frame, c.intervalNs);
+            emit(frame, c);
         }
         return;
     }
@@ -650,21 +665,46 @@ void FlowWriter::sendPackets(bool all) {
         const std::uint16_t portA = c.portA ? c.portA : sctpUser(c.adaptation).port;
         const std::uint16_t portB = c.portB ? c.portB : sctpUser(c.adaptation).port;
         const Bytes sctp = sctpPacket(b ? portB : portA, b ? portA : portB, kVtag[b], chunks);
-        Bytes ip;
-        if (c.ipv6) {
-            ip = ipv6(kIpv6[b], kIpv6[!b], kIpProtoSctp, sctp, c.ipOptions);
-        } else {
-            const View opts = c.ipOptions ? View(kRouterAlert) : View();
-            ip = ipv4(kIpv4[b], kIpv4[!b], kIpProtoSctp, sctp, side_[b].ipId++, opts);
-        }
-        emit(linkFrame(ip, c, b), c.intervalNs);
+        for (const Bytes &ip : ipPackets(sctp, c))
+            emit(linkFrame(ip, c, b), c);
     }
     pending_.erase(pending_.begin(), pending_.begin() + static_cast<std::ptrdiff_t>(done));
 }
 
+std::vector<Bytes> FlowWriter::ipPackets(View sctp, const Carrier &c) {
+    const bool b = c.reverse;
+    const std::uint16_t id = side_[b].ipId++;
+    const View opts = c.ipOptions ? View(kRouterAlert) : View();
+    const auto packet = [&](View piece, std::size_t offset, bool more) {
+        if (c.ipv6) {
+            const Ipv6Fragment f{id, static_cast<std::uint16_t>(offset), more};
+            return ipv6(kIpv6[b], kIpv6[!b], kIpProtoSctp, piece, c.ipOptions, more || offset ? &f : nullptr);
+        }
+        return ipv4(kIpv4[b], kIpv4[!b], kIpProtoSctp, piece, id, opts, static_cast<std::uint16_t>(offset), more);
+    };
+    const std::size_t piece = c.ipFragment & ~std::size_t(7);
+    if (piece == 0 || sctp.size() <= piece)
+        return {packet(sctp, 0, false)};
+    // Fragments of `piece` octets; with Overlap each after the first starts
+    // 8 octets earlier, carrying those octets again.
+    std::vector<Bytes> out;
+    for (std::size_t at = 0; at < sctp.size(); at += piece) {
+        const std::size_t from = c.fragmentOrder == FragmentOrder::Overlap && at != 0 ? at - 8 : at;
+        const std::size_t to = std::min(at + piece, sctp.size());
+        out.push_back(packet(sctp.subspan(from, to - from), from, to < sctp.size()));
+        if (c.fragmentOrder == FragmentOrder::Duplicate && to < sctp.size())
+            out.push_back(out.back());
+    }
+    if (c.fragmentOrder == FragmentOrder::Reverse)
+        std::reverse(out.begin(), out.end());
+    if (c.fragmentOrder == FragmentOrder::Missing)
+        out.pop_back();
+    return out;
+}
+
 Bytes FlowWriter::linkFrame(View ip, const Carrier &c, bool fromB) {
     const std::uint16_t etherType = c.ipv6 ? kEtherIpv6 : kEtherIpv4;
-    switch (file_.options().link) {
+    switch (file_.link(c.interface)) {
     case Link::Ethernet:
         return ethernet(kMac[!fromB], kMac[fromB], etherType, ip, c.vlans);
     case Link::LinuxSll:
@@ -683,9 +723,9 @@ Bytes FlowWriter::linkFrame(View ip, const Carrier &c, bool fromB) {
     return Bytes(ip.begin(), ip.end());
 }
 
-void FlowWriter::emit(View frame, std::uint64_t intervalNs) {
-    file_.frame(now_, frame);
-    now_ += intervalNs;
+void FlowWriter::emit(View frame, const Carrier &c) {
+    file_.frame(now_, frame, c.interface);
+    now_ += c.intervalNs;
 }
 
 } // namespace capwrite

@@ -125,8 +125,16 @@ struct Ipv6Address {
 // fragOffset is in octets (a multiple of 8), moreFragments sets MF.
 Bytes ipv4(Ipv4Address src, Ipv4Address dst, std::uint8_t proto, View payload, std::uint16_t id,
            View options = {}, std::uint16_t fragOffset = 0, bool moreFragments = false);
-// IPv6 header; hopByHop adds an 8-octet hop-by-hop options header.
-Bytes ipv6(const Ipv6Address &src, const Ipv6Address &dst, std::uint8_t proto, View payload, bool hopByHop = false);
+// IPv6 header; hopByHop adds an 8-octet hop-by-hop options header.  With
+// `fragment`, the payload is a fragment at that offset (octets, a multiple
+// of 8), after a fragment header.
+struct Ipv6Fragment {
+    std::uint32_t id = 0;
+    std::uint16_t offset = 0;
+    bool more = false;
+};
+Bytes ipv6(const Ipv6Address &src, const Ipv6Address &dst, std::uint8_t proto, View payload, bool hopByHop = false,
+           const Ipv6Fragment *fragment = nullptr);
 
 inline constexpr std::uint16_t kEtherIpv4 = 0x0800, kEtherIpv6 = 0x86DD;
 
@@ -165,6 +173,8 @@ struct FileOptions {
     Link link = Link::Ethernet;
     bool nanoseconds = false;   // nanosecond time stamps (pcap magic, pcapng if_tsresol)
     std::uint32_t snaplen = 0;  // 0: 262144; frames longer are cut to it
+    // pcapng: further interfaces (1, 2, ...) after the first, of `link`.
+    std::vector<Link> moreLinks;
 };
 
 // Writes frames to a stdio stream (not closed here).  Time stamps are in
@@ -172,7 +182,9 @@ struct FileOptions {
 class CaptureFile {
 public:
     CaptureFile(std::FILE *out, const FileOptions &o);
-    void frame(std::uint64_t timeNs, View data);
+    void frame(std::uint64_t timeNs, View data, std::size_t interface = 0);
+    std::size_t interfaces() const { return 1 + opt_.moreLinks.size(); }
+    Link link(std::size_t interface) const { return interface == 0 ? opt_.link : opt_.moreLinks.at(interface - 1); }
     std::uint64_t frames() const { return frames_; }
     const FileOptions &options() const { return opt_; }
 
@@ -186,6 +198,11 @@ private:
 
 // The whole capture in memory: for tests.
 Bytes captureBytes(const FileOptions &o, const std::vector<std::pair<std::uint64_t, Bytes>> &frames);
+
+// How the fragments of one IP datagram are sent: in order, last first,
+// each after the first reaching 8 octets back into the one before (the
+// same octets again), each but the last twice, or all but the last.
+enum class FragmentOrder { InOrder, Reverse, Overlap, Duplicate, Missing };
 
 // ---- flows -----------------------------------------------------------------------
 
@@ -206,6 +223,9 @@ struct Carrier {
     std::uint16_t portA = 0, portB = 0; // 0: the adaptation's own
     std::size_t bundle = 1;       // DATA chunks per SCTP packet
     std::size_t fragment = 0;     // at most this many octets per DATA chunk (0: whole)
+    std::size_t ipFragment = 0;   // at most this many payload octets per IP fragment (0: whole)
+    FragmentOrder fragmentOrder = FragmentOrder::InOrder;
+    std::size_t interface = 0;    // pcapng interface the frames go out on
     RoutingLabel label;           // opc = side a, dpc = side b
     SccpOptions sccp;
     std::size_t segment = 0;      // XUDT: at most this many data octets per segment
@@ -236,7 +256,8 @@ private:
     std::vector<Bytes> userMessages(View tcap, const Carrier &c);
     void queue(const Bytes &userMessage, const Carrier &c);
     void sendPackets(bool all);
-    void emit(View frame, std::uint64_t intervalNs);
+    void emit(View frame, const Carrier &c);
+    std::vector<Bytes> ipPackets(View sctp, const Carrier &c);
     Bytes linkFrame(View ipPacket, const Carrier &c, bool fromB);
 
     CaptureFile &file_;

@@ -20,6 +20,10 @@
 #include <string>
 #include <vector>
 
+#if DPX_HAVE_ZLIB
+#include <zlib.h>
+#endif
+
 namespace {
 
 using namespace capwrite;
@@ -30,15 +34,20 @@ const char kUsage[] =
     "File options:\n"
     "  -o, --output PATH      capture to write ('-': standard output)\n"
     "  --format pcap|pcapng   default: pcapng when PATH ends in .pcapng, else pcap\n"
-    "  --link NAME            ethernet (default), sll, sll2, raw, loopback, mtp2, mtp2-phdr, mtp3\n"
+    "  --link NAME[,NAME]...  ethernet (default), sll, sll2, raw, loopback, mtp2, mtp2-phdr, mtp3;\n"
+    "                         pcapng: one interface per name (interface 0, 1, ...)\n"
     "  --nanoseconds          nanosecond time stamps\n"
     "  --snaplen N            cut frames to N octets\n"
     "  --time SECONDS         time stamp of the first frame (default 1767225600)\n"
+    "  PATH ending in .gz     the capture is written gzip-compressed\n"
     "Message options (also on '#@' lines of the input, from that line on):\n"
     "  --sigtran m3ua|m2ua|m2pa|sua   adaptation over SCTP (default m3ua)\n"
     "  --ipv4 | --ipv6        IP version (default 4)\n"
     "  --ip-options | --no-ip-options   IPv4 router-alert option / IPv6 hop-by-hop header\n"
     "  --vlan ID              add an Ethernet VLAN tag (repeat for QinQ); --no-vlan clears\n"
+    "  --interface N          pcapng interface the frames go out on (default 0)\n"
+    "  --ip-fragment N        at most N payload octets per IP fragment (default 0: unfragmented)\n"
+    "  --ip-fragment-order in|reverse|overlap|duplicate|missing   how fragments are sent\n"
     "  --bundle N             DATA chunks per SCTP packet (default 1)\n"
     "  --fragment N           at most N octets per DATA chunk (default 0: unfragmented)\n"
     "  --stream N, --ppid N, --ports A,B   SCTP stream, payload protocol id, ports\n"
@@ -120,6 +129,14 @@ const std::map<std::string, OptionDef> &messageOptions() {
              s.carrier.vlans.push_back(static_cast<std::uint16_t>(number(v, 4095)));
          }}},
         {"--no-vlan", {false, [](Settings &s, const std::string &) { s.carrier.vlans.clear(); }}},
+        {"--interface", {true, [](Settings &s, const std::string &v) { s.carrier.interface = number(v, 255); }}},
+        {"--ip-fragment", {true, [](Settings &s, const std::string &v) { s.carrier.ipFragment = number(v, 65535); }}},
+        {"--ip-fragment-order", {true, [](Settings &s, const std::string &v) {
+             choose(s.carrier.fragmentOrder, v,
+                    {{"in", FragmentOrder::InOrder}, {"reverse", FragmentOrder::Reverse},
+                     {"overlap", FragmentOrder::Overlap}, {"duplicate", FragmentOrder::Duplicate},
+                     {"missing", FragmentOrder::Missing}});
+         }}},
         {"--bundle", {true, [](Settings &s, const std::string &v) { s.carrier.bundle = number(v, 1000); }}},
         {"--fragment", {true, [](Settings &s, const std::string &v) { s.carrier.fragment = number(v, 65535); }}},
         {"--stream", {true, [](Settings &s, const std::string &v) {
@@ -220,6 +237,26 @@ std::vector<std::string> words(const std::string &line) {
     return out;
 }
 
+// A stdio stream that writes gzip-compressed to `path`; null (errno set)
+// when it cannot be opened, or when this capwrite was built without zlib.
+std::FILE *gzipFile(const std::string &path) {
+#if DPX_HAVE_ZLIB
+    gzFile gz = gzopen(path.c_str(), "wb");
+    if (gz == nullptr)
+        return nullptr;
+    cookie_io_functions_t io{};
+    io.write = [](void *c, const char *buf, std::size_t n) -> ssize_t {
+        return gzwrite(static_cast<gzFile>(c), buf, static_cast<unsigned>(n));
+    };
+    io.close = [](void *c) { return gzclose(static_cast<gzFile>(c)) == Z_OK ? 0 : -1; };
+    return fopencookie(gz, "w", io);
+#else
+    (void)path;
+    errno = ENOTSUP;
+    return nullptr;
+#endif
+}
+
 struct Run {
     Settings settings;
     int status = 0;
@@ -291,7 +328,18 @@ int runMain(int argc, char **argv) {
             if (format != "pcap" && format != "pcapng")
                 throw UsageError("--format: pcap or pcapng");
         } else if (a == "--link") {
-            choose(fo.link, value(), links);
+            std::istringstream names(value());
+            fo.moreLinks.clear();
+            bool first = true;
+            for (std::string name; std::getline(names, name, ',');) {
+                Link l{};
+                choose(l, name, links);
+                if (first)
+                    fo.link = l;
+                else
+                    fo.moreLinks.push_back(l);
+                first = false;
+            }
         } else if (a == "--nanoseconds") {
             fo.nanoseconds = true;
         } else if (a == "--snaplen") {
@@ -307,12 +355,13 @@ int runMain(int argc, char **argv) {
     if (output.empty())
         throw UsageError("no output: -o PATH");
     if (format.empty())
-        format = output.size() >= 7 && output.compare(output.size() - 7, 7, ".pcapng") == 0 ? "pcapng" : "pcap";
+        format = output.find(".pcapng") != std::string::npos ? "pcapng" : "pcap";
     fo.format = format == "pcapng" ? FileFormat::Pcapng : FileFormat::Pcap;
     if (inputs.empty())
         inputs.push_back("-");
 
-    std::FILE *out = output == "-" ? stdout : std::fopen(output.c_str(), "wb");
+    const bool gzip = output.size() > 3 && output.compare(output.size() - 3, 3, ".gz") == 0;
+    std::FILE *out = output == "-" ? stdout : gzip ? gzipFile(output) : std::fopen(output.c_str(), "wb");
     if (!out) {
         std::cerr << "capwrite: " << output << ": " << std::strerror(errno) << '\n';
         return 1;

@@ -5,7 +5,8 @@
 // Exit status: 0 all input decoded; 1 some input line was not hex or a file
 // could not be read (the rest is still decoded); 2 the module could not be
 // loaded; 3 a capture is damaged (every frame before the damage is
-// decoded); 64 bad command line.
+// decoded); 4 a capture held no CAMEL message (standard error says what it
+// held); 64 bad command line.  When several apply: 3 before 1 before 4.
 
 #include <CLI/CLI.hpp>
 #include <unistd.h>
@@ -34,6 +35,7 @@ namespace {
 constexpr int kExitBadInput = 1;
 constexpr int kExitNoModule = 2;
 constexpr int kExitDamagedCapture = 3;
+constexpr int kExitNoCamel = 4;
 constexpr int kExitUsage = 64;
 
 dpxdecode::PassSelection selectPasses(const std::vector<std::string> &names) {
@@ -125,8 +127,9 @@ int main(int argc, char **argv) {
     app.add_flag("--version", version, "print the module's version and interface version, and exit");
     app.add_option("--module", modulePath,
                    "decoder module to load (default: 3gpp_camel_400_DLL.so beside dpx-decode)");
-    app.add_option("--ssn", ssnList,
-                   "captures: take SCCP messages whose called or calling SSN is in this list (default 146)");
+    auto *ssnOption = app.add_option("--ssn", ssnList,
+                                     "captures: take only SCCP messages whose called or calling SSN is in this "
+                                     "list (default: SSN 146, and dialogues naming a CAMEL context on any SSN)");
     app.add_flag("--ansi", ansi, "captures: ANSI MTP3 routing labels and SCCP addresses");
     app.add_flag("--summary", summary, "one line per message instead of the passes' output");
     app.add_flag("--stats{messages}", statsKinds,
@@ -166,6 +169,7 @@ int main(int argc, char **argv) {
         std::cerr << "dpx-decode: --ssn: expected subsystem numbers 0-255 and ranges, e.g. 146,6-8\n";
         return kExitUsage;
     }
+    inputOptions.walk.camelDialogues = ssnOption->count() == 0;
     inputOptions.progress = isatty(STDERR_FILENO) == 1;
     const bool stats = std::find(statsKinds.begin(), statsKinds.end(), "messages") != statsKinds.end();
     const bool srt = std::find(statsKinds.begin(), statsKinds.end(), "srt") != statsKinds.end();
@@ -341,5 +345,7 @@ int main(int argc, char **argv) {
     std::cout.flush();
     if (report.damagedCapture)
         return kExitDamagedCapture;
-    return !report.badInput && std::cout.good() ? 0 : kExitBadInput;
+    if (report.badInput || !std::cout.good())
+        return kExitBadInput;
+    return report.captureWithoutCamel ? kExitNoCamel : 0;
 }

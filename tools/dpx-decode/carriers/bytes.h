@@ -54,9 +54,12 @@ enum class Skip : uint8_t {
     Mtp2Truncated,
     Mtp2NotMsu,
     Ipv4Truncated,
-    Ipv4Fragment,
     Ipv6Truncated,
-    Ipv6Fragment,
+    IpFragmentDuplicate,
+    IpFragmentOverlap,
+    IpFragmentBeyondEnd,
+    IpFragmentIncomplete,
+    IpFragmentNoRoom,
     IpNotSctp,
     SctpTruncated,
     SctpChunkTruncated,
@@ -79,6 +82,7 @@ enum class Skip : uint8_t {
     SccpBadPointer,
     SccpUnsupportedType,
     SccpSsnNotSelected,
+    TcapNotCamel,
     SccpSegmentDropped,
     Count
 };

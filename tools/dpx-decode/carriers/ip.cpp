@@ -20,10 +20,13 @@ IpOut parseIpv4(Bytes p) {
     const size_t total = p.be16(2);
     if (headerLength < 20 || total < headerLength || total > p.size)
         return skipped(Skip::Ipv4Truncated);
-    // More fragments, or an offset: a piece of a larger packet.
-    if ((p.be16(6) & 0x3FFF) != 0)
-        return skipped(Skip::Ipv4Fragment);
     IpOut o;
+    // More fragments, or an offset: a piece of a larger packet.
+    const uint16_t flagsOffset = p.be16(6);
+    o.fragment = (flagsOffset & 0x3FFF) != 0;
+    o.moreFragments = (flagsOffset & 0x2000) != 0;
+    o.fragmentOffset = uint32_t(flagsOffset & 0x1FFF) * 8;
+    o.identification = p.be16(4);
     o.protocol = p.u8(9);
     o.addressLength = 4;
     std::memcpy(o.source, p.data + 12, 4);
@@ -43,8 +46,10 @@ IpOut parseIpv6(Bytes p) {
     o.addressLength = 16;
     std::memcpy(o.source, p.data + 8, 16);
     std::memcpy(o.destination, p.data + 24, 16);
-    Bytes rest = p.sub(40, payloadLength);
-    uint8_t next = p.u8(6);
+    return ipv6Upper(o, p.u8(6), p.sub(40, payloadLength));
+}
+
+IpOut ipv6Upper(IpOut o, uint8_t next, Bytes rest) {
     for (;;) {
         switch (next) {
         case 0:  // hop-by-hop options
@@ -62,12 +67,22 @@ IpOut parseIpv6(Bytes p) {
             rest = rest.from(length);
             continue;
         }
-        case 44: // fragment: only an atomic fragment (offset 0, no more) is whole
+        case 44: // fragment: an atomic fragment (offset 0, no more) is whole
         {
             if (!rest.has(0, 8))
                 return skipped(Skip::Ipv6Truncated);
-            if ((rest.be16(2) & 0xFFF9) != 0)
-                return skipped(Skip::Ipv6Fragment);
+            const uint16_t offsetFlags = rest.be16(2);
+            if ((offsetFlags & 0xFFF9) != 0) {
+                if (o.fragment) // a fragment header inside a reassembled datagram
+                    return skipped(Skip::Ipv6Truncated);
+                o.fragment = true;
+                o.moreFragments = (offsetFlags & 1) != 0;
+                o.fragmentOffset = offsetFlags & 0xFFF8;
+                o.identification = rest.be32(4);
+                o.protocol = rest.u8(0);
+                o.payload = rest.from(8);
+                return o;
+            }
             next = rest.u8(0);
             rest = rest.from(8);
             continue;

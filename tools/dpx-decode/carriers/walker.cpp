@@ -18,9 +18,12 @@ const char *skipName(Skip s) {
     case Skip::Mtp2Truncated: return "mtp2: truncated";
     case Skip::Mtp2NotMsu: return "mtp2: fill-in or link status unit";
     case Skip::Ipv4Truncated: return "ipv4: truncated or bad header";
-    case Skip::Ipv4Fragment: return "ipv4: fragment";
     case Skip::Ipv6Truncated: return "ipv6: truncated or bad header";
-    case Skip::Ipv6Fragment: return "ipv6: fragment";
+    case Skip::IpFragmentDuplicate: return "ip: duplicate fragment";
+    case Skip::IpFragmentOverlap: return "ip: fragment of a datagram whose fragments overlap with different octets";
+    case Skip::IpFragmentBeyondEnd: return "ip: fragment of a datagram with a fragment past its end";
+    case Skip::IpFragmentIncomplete: return "ip: fragment of a datagram never completed";
+    case Skip::IpFragmentNoRoom: return "ip: fragment dropped at the reassembly memory limit";
     case Skip::IpNotSctp: return "ip: not SCTP";
     case Skip::SctpTruncated: return "sctp: truncated";
     case Skip::SctpChunkTruncated: return "sctp: chunk truncated";
@@ -43,6 +46,7 @@ const char *skipName(Skip s) {
     case Skip::SccpBadPointer: return "sccp: pointer or address out of bounds";
     case Skip::SccpUnsupportedType: return "sccp: not UDT, XUDT or LUDT";
     case Skip::SccpSsnNotSelected: return "sccp: SSN not selected";
+    case Skip::TcapNotCamel: return "tcap: not SSN 146 and not in a dialogue naming a CAMEL context";
     case Skip::SccpSegmentDropped: return "sccp: segment dropped";
     case Skip::Count: break;
     }
@@ -51,6 +55,7 @@ const char *skipName(Skip s) {
 
 size_t FrameWalker::walk(uint32_t linkType, Bytes frame, MessageSink &sink) {
     found_ = 0;
+    ++frames_;
     const LinkOut link = parseLink(linkType, frame);
     if (link.skip != Skip::None) {
         count(link.skip);
@@ -60,17 +65,29 @@ size_t FrameWalker::walk(uint32_t linkType, Bytes frame, MessageSink &sink) {
         mtp3(link.payload, sink);
         return found_;
     }
-    const IpOut ip = link.network == Network::Ipv4 ? parseIpv4(link.payload) : parseIpv6(link.payload);
-    if (ip.skip != Skip::None) {
-        count(ip.skip);
-        return 0;
-    }
-    if (ip.protocol != kProtocolSctp) {
-        count(Skip::IpNotSctp);
-        return 0;
-    }
-    sctp(ip, sink);
+    ip(link.network == Network::Ipv4 ? parseIpv4(link.payload) : parseIpv6(link.payload), sink);
     return found_;
+}
+
+void FrameWalker::ip(IpOut packet, MessageSink &sink) {
+    if (packet.skip == Skip::None && packet.fragment) {
+        IpOut whole;
+        if (ip_.add(packet, frames_, whole) != IpReassembler::Verdict::Packet)
+            return;
+        // An IPv6 datagram's payload may start with more extension headers;
+        // it is still marked a fragment, so one more fragment header inside
+        // is refused.
+        packet = whole.addressLength == 16 ? ipv6Upper(whole, whole.protocol, whole.payload) : whole;
+    }
+    if (packet.skip != Skip::None) {
+        count(packet.skip);
+        return;
+    }
+    if (packet.protocol != kProtocolSctp) {
+        count(Skip::IpNotSctp);
+        return;
+    }
+    sctp(packet, sink);
 }
 
 void FrameWalker::sctp(const IpOut &ip, MessageSink &sink) {
@@ -163,6 +180,7 @@ void FrameWalker::userMessage(uint32_t protocolId, uint16_t sport, uint16_t dpor
         m.callingSsn = s.calling.ssn;
         m.calledGt = s.called.gt;
         m.callingGt = s.calling.gt;
+        countSsn(m.hasCalledSsn, m.calledSsn);
         emit(m, sink);
         return;
     }
@@ -198,11 +216,15 @@ void FrameWalker::sccp(Bytes message, const Origin &origin, MessageSink &sink) {
     m.calledGt = s.called.gt;
     m.callingGt = s.calling.gt;
     if (!selected(m))
+    countSsn(m.hasCalledSsn, m.calledSsn);
+    // Segments are put together only when their message may be taken.
+    if (!options_.camelDialogues && !listed(m)) {
+        count(Skip::SccpSsnNotSelected);
         return;
+    }
     switch (sccp_.add(m.opc, s, m.tcap)) {
     case SccpReassembler::Verdict::Message:
-        sink.onTcap(m);
-        ++found_;
+        emit(m, sink);
         return;
     case SccpReassembler::Verdict::Pending:
         return;
@@ -212,15 +234,34 @@ void FrameWalker::sccp(Bytes message, const Origin &origin, MessageSink &sink) {
     }
 }
 
-bool FrameWalker::selected(const TcapMessage &m) {
-    if ((m.hasCalledSsn && options_.ssns.test(m.calledSsn)) || (m.hasCallingSsn && options_.ssns.test(m.callingSsn)))
+void FrameWalker::countSsn(bool hasSsn, uint8_t ssn) {
+    if (hasSsn)
+        ++sccpCounts_.byCalledSsn[ssn];
+    else
+        ++sccpCounts_.withoutSsn;
+}
+
+bool FrameWalker::listed(const TcapMessage &m) const {
+    return (m.hasCalledSsn && options_.ssns.test(m.calledSsn)) ||
+           (m.hasCallingSsn && options_.ssns.test(m.callingSsn));
+}
+
+bool FrameWalker::taken(const TcapMessage &m) {
+    const bool byList = listed(m);
+    if (!options_.camelDialogues) {
+        if (!byList)
+            count(Skip::SccpSsnNotSelected);
+        return byList;
+    }
+    // Dialogues on SSN 146 are learnt too: they may go on on another SSN.
+    if (dialogues_.take(peekTcap(m.tcap), byList))
         return true;
-    count(Skip::SccpSsnNotSelected);
+    count(Skip::TcapNotCamel);
     return false;
 }
 
 void FrameWalker::emit(const TcapMessage &m, MessageSink &sink) {
-    if (!selected(m))
+    if (!taken(m))
         return;
     sink.onTcap(m);
     ++found_;

@@ -8,81 +8,89 @@
 #include <chrono>
 #include <cstdio>
 #include <cstring>
+#include <memory>
 #include <ostream>
 
 #include "capture_file.h"
 #include "hex_line.h"
+#include "streams.h"
 
 namespace dpxdecode {
 namespace {
 
-// An input file or standard input as a stdio stream whose first octets
-// were already read to look at the magic number: they are handed out
-// again before the rest.  Counts the octets read, for the progress line.
-struct Source {
-    int fd = -1;
-    bool ownsFd = false;
-    uint8_t head[4] = {};
-    size_t headSize = 0;
-    size_t headPos = 0;
-    uint64_t consumed = 0;
-    uint64_t fileSize = 0; // 0 when not a regular file
-    int error = 0;
-
-    static ssize_t read(void *cookie, char *buf, size_t n) {
-        auto *s = static_cast<Source *>(cookie);
-        if (s->headPos < s->headSize) {
-            const size_t k = std::min(n, s->headSize - s->headPos);
-            std::memcpy(buf, s->head + s->headPos, k);
-            s->headPos += k;
-            s->consumed += k;
-            return ssize_t(k);
-        }
+// An input file or standard input.  Counts the octets read, for the
+// progress line.
+class FdStream final : public ByteStream {
+public:
+    FdStream(int fd, bool owned) : fd_(fd), owned_(owned) {
+        struct stat st{};
+        if (fstat(fd_, &st) == 0 && S_ISREG(st.st_mode))
+            fileSize_ = uint64_t(st.st_size);
+    }
+    ~FdStream() override {
+        if (owned_)
+            ::close(fd_);
+    }
+    long read(uint8_t *buf, size_t n) override {
         for (;;) {
-            const ssize_t got = ::read(s->fd, buf, n);
+            const ssize_t got = ::read(fd_, buf, n);
             if (got < 0 && errno == EINTR)
                 continue;
             if (got < 0)
-                s->error = errno;
-            else
-                s->consumed += uint64_t(got);
-            return got;
+                return fail(std::strerror(errno));
+            consumed_ += uint64_t(got);
+            return long(got);
         }
     }
-    static int close(void *cookie) {
-        auto *s = static_cast<Source *>(cookie);
-        if (s->ownsFd && s->fd >= 0)
-            ::close(s->fd);
-        s->fd = -1;
-        return 0;
+    uint64_t consumed() const { return consumed_; }
+    uint64_t fileSize() const { return fileSize_; } // 0 when not a regular file
+
+private:
+    int fd_;
+    bool owned_;
+    uint64_t consumed_ = 0;
+    uint64_t fileSize_ = 0;
+};
+
+// A ByteStream as a stdio stream, for reading hex lines with getline.
+struct CookieStream {
+    ByteStream *stream = nullptr;
+    bool failed = false;
+
+    static ssize_t read(void *cookie, char *buf, size_t n) {
+        auto *c = static_cast<CookieStream *>(cookie);
+        const long got = c->stream->read(reinterpret_cast<uint8_t *>(buf), n);
+        c->failed |= got < 0;
+        return got;
     }
 };
 
-// Reads up to four octets: fewer only at the end of the input.
-bool readHead(Source &s) {
-    while (s.headSize < sizeof s.head) {
-        const ssize_t got = ::read(s.fd, s.head + s.headSize, sizeof s.head - s.headSize);
-        if (got < 0 && errno == EINTR)
-            continue;
-        if (got < 0) {
-            s.error = errno;
-            return false;
-        }
-        if (got == 0)
-            break;
-        s.headSize += size_t(got);
-    }
-    return true;
-}
-
-FILE *openStream(Source &s) {
+FILE *openStream(CookieStream &c) {
     cookie_io_functions_t io{};
-    io.read = &Source::read;
-    io.close = &Source::close;
-    FILE *f = fopencookie(&s, "r", io);
+    io.read = &CookieStream::read;
+    FILE *f = fopencookie(&c, "r", io);
     if (f != nullptr)
         std::setvbuf(f, nullptr, _IOFBF, 1 << 16);
     return f;
+}
+
+// Which SCCP messages the walker takes, for the note on a capture without
+// any: "SSN 146 and ..." or the --ssn list ("SSN 6-8, 146").
+std::string describeSelection(const capture::WalkOptions &walk) {
+    std::string list;
+    for (size_t s = 0; s < walk.ssns.size(); ++s) {
+        if (!walk.ssns.test(s) || (s > 0 && walk.ssns.test(s - 1)))
+            continue;
+        size_t last = s;
+        while (last + 1 < walk.ssns.size() && walk.ssns.test(last + 1))
+            ++last;
+        list += (list.empty() ? "" : ", ") + std::to_string(s) + (last != s ? "-" + std::to_string(last) : "");
+    }
+    if (list.empty())
+        list = "none";
+    if (walk.camelDialogues)
+        return "SSN " + list + ", and dialogues naming a CAMEL application context on any SSN";
+    return "SSN " + list + " only";
 }
 
 class Reader {
@@ -107,40 +115,40 @@ public:
     }
 
     void file(const std::string &path) {
-        Source s;
         const bool stdinput = path == "-";
         const std::string name = stdinput ? "<stdin>" : path;
-        if (stdinput) {
-            s.fd = STDIN_FILENO;
-        } else {
-            s.fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
-            s.ownsFd = true;
-            if (s.fd < 0) {
-                errors_ << "dpx-decode: " << path << ": " << std::strerror(errno) << '\n';
-                report_.badInput = true;
+        const int fd = stdinput ? STDIN_FILENO : ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
+        if (fd < 0) {
+            fileError(name, std::strerror(errno));
+            return;
+        }
+        FdStream raw(fd, !stdinput);
+        // A compressed file is looked at again once decompressed: it may
+        // hold a capture or hex lines.
+        PeekStream outer(raw);
+        if (!outer.peek(4)) {
+            fileError(name, outer.error());
+            return;
+        }
+        const Compression compression = compressionOf(outer.head(), outer.headSize());
+        std::unique_ptr<ByteStream> decompressed;
+        if (compression != Compression::None) {
+            std::string why;
+            decompressed = decompressing(compression, outer, why);
+            if (decompressed == nullptr) {
+                fileError(name, why);
                 return;
             }
         }
-        struct stat st{};
-        if (fstat(s.fd, &st) == 0 && S_ISREG(st.st_mode))
-            s.fileSize = uint64_t(st.st_size);
-        if (!readHead(s)) {
-            errors_ << "dpx-decode: " << name << ": " << std::strerror(s.error) << '\n';
-            report_.badInput = true;
-            Source::close(&s);
+        PeekStream content(decompressed != nullptr ? *decompressed : static_cast<ByteStream &>(outer));
+        if (!content.peek(4)) {
+            fileError(name, content.error());
             return;
         }
-        FILE *f = openStream(s);
-        if (f == nullptr) {
-            errors_ << "dpx-decode: " << name << ": " << std::strerror(errno) << '\n';
-            report_.badInput = true;
-            Source::close(&s);
-            return;
-        }
-        if (s.headSize == sizeof s.head && isCaptureMagic(s.head))
-            captureStream(f, s, name);
+        if (content.headSize() == 4 && isCaptureMagic(content.head()))
+            captureStream(content, raw, name);
         else
-            hexStream(f, s, name);
+            hexStream(content, name);
     }
 
     InputReport report() {
@@ -149,7 +157,18 @@ public:
     }
 
 private:
-    void hexStream(FILE *f, Source &s, const std::string &name) {
+    void fileError(const std::string &name, const std::string &why) {
+        errors_ << "dpx-decode: " << name << ": " << why << '\n';
+        report_.badInput = true;
+    }
+
+    void hexStream(ByteStream &stream, const std::string &name) {
+        CookieStream cookie{&stream, false};
+        FILE *f = openStream(cookie);
+        if (f == nullptr) {
+            fileError(name, std::strerror(errno));
+            return;
+        }
         InputMessage msg;
         msg.source = name;
         char *line = nullptr;
@@ -173,10 +192,8 @@ private:
             onMessage_(msg);
         }
         std::free(line);
-        if (s.error != 0) {
-            errors_ << "dpx-decode: " << name << ": read error: " << std::strerror(s.error) << '\n';
-            report_.badInput = true;
-        }
+        if (cookie.failed)
+            fileError(name, "read error: " + stream.error());
         std::fclose(f);
     }
 
@@ -192,17 +209,21 @@ private:
         onMessage_(message_);
     }
 
-    void captureStream(FILE *f, Source &s, const std::string &name) {
+    void captureStream(ByteStream &stream, const FdStream &raw, const std::string &name) {
         message_.source = name;
         message_.line = 0;
         message_.capture = &origin_;
         walker_.newCapture();
+        const CaptureCounts before = counts();
         Sink sink;
         sink.reader = this;
         const auto start = std::chrono::steady_clock::now();
         auto lastShown = start;
         bool shown = false;
-        const CaptureResult r = readCaptureFile(f, [&](const Frame &frame) {
+        CaptureReader reader(stream);
+        Frame frame;
+        CaptureReader::Next next;
+        while ((next = reader.next(frame)) == CaptureReader::Next::Frame) {
             origin_.frame = frame.number;
             origin_.seconds = frame.seconds;
             origin_.nanoseconds = frame.nanoseconds;
@@ -211,27 +232,72 @@ private:
             if (options_.progress && (frame.number & 0x3FF) == 0) {
                 const auto now = std::chrono::steady_clock::now();
                 if (now - start > std::chrono::seconds(1) && now - lastShown > std::chrono::milliseconds(200)) {
-                    showProgress(name, frame.number, s);
+                    showProgress(name, frame.number, raw);
                     shown = true;
                     lastShown = now;
                 }
             }
-        });
+        }
+        walker_.endCapture();
         if (shown)
             std::fputs("\r\033[K", stderr);
-        report_.frames += r.frames;
-        if (!r.ok) {
-            errors_ << "dpx-decode: " << name << ": " << r.error << '\n';
+        report_.frames += reader.frames();
+        if (next == CaptureReader::Next::Damaged) {
+            errors_ << "dpx-decode: " << name << ": " << reader.error() << '\n';
             report_.damagedCapture = true;
+        }
+        if (messages_ == before.messages) {
+            report_.captureWithoutCamel = true;
+            explainNoCamel(name, before, reader.frames());
         }
     }
 
-    void showProgress(const std::string &name, uint64_t frames, const Source &s) {
+    // What the walker has counted so far, to tell one capture's share.
+    struct CaptureCounts {
+        uint64_t messages = 0;
+        std::array<uint64_t, capture::kSkipCount> skips{};
+        capture::SccpCounts sccp;
+    };
+    CaptureCounts counts() const { return CaptureCounts{messages_, walker_.skips(), walker_.sccpCounts()}; }
+
+    // Says why a capture gave no message: how many frames it has, which
+    // subsystems its SCCP messages went to, what was skipped.
+    void explainNoCamel(const std::string &name, const CaptureCounts &before, uint64_t frames) {
+        const CaptureCounts after = counts();
+        const std::string lead = "dpx-decode: " + name + ": ";
+        errors_ << lead << "no CAMEL message in " << frames << (frames == 1 ? " frame" : " frames") << '\n';
+        uint64_t sccp = after.sccp.withoutSsn - before.sccp.withoutSsn;
+        std::string bySsn;
+        for (size_t ssn = 0; ssn < after.sccp.byCalledSsn.size(); ++ssn) {
+            const uint64_t n = after.sccp.byCalledSsn[ssn] - before.sccp.byCalledSsn[ssn];
+            if (n == 0)
+                continue;
+            sccp += n;
+            bySsn += (bySsn.empty() ? "" : ", ") + std::to_string(n) + " to SSN " + std::to_string(ssn);
+        }
+        if (after.sccp.withoutSsn != before.sccp.withoutSsn)
+            bySsn += (bySsn.empty() ? "" : ", ") + std::to_string(after.sccp.withoutSsn - before.sccp.withoutSsn) +
+                     " routed without an SSN";
+        if (sccp != 0)
+            errors_ << lead << "  " << sccp << " SCCP messages: " << bySsn << "; taken: "
+                    << describeSelection(options_.walk) << '\n';
+        std::string skipped;
+        for (size_t i = 1; i < capture::kSkipCount; ++i) {
+            const uint64_t n = after.skips[i] - before.skips[i];
+            if (n != 0)
+                skipped += (skipped.empty() ? "" : "; ") + std::string(capture::skipName(capture::Skip(i))) + ": " +
+                           std::to_string(n);
+        }
+        if (!skipped.empty())
+            errors_ << lead << "  skipped: " << skipped << '\n';
+    }
+
+    void showProgress(const std::string &name, uint64_t frames, const FdStream &raw) {
         char line[256];
-        if (s.fileSize != 0)
+        if (raw.fileSize() != 0)
             std::snprintf(line, sizeof line, "\r%s: %llu frames, %llu messages, %.0f%%", name.c_str(),
                           static_cast<unsigned long long>(frames), static_cast<unsigned long long>(messages_),
-                          100.0 * double(s.consumed) / double(s.fileSize));
+                          100.0 * double(raw.consumed()) / double(raw.fileSize()));
         else
             std::snprintf(line, sizeof line, "\r%s: %llu frames, %llu messages", name.c_str(),
                           static_cast<unsigned long long>(frames), static_cast<unsigned long long>(messages_));

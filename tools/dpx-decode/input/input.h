@@ -37,6 +37,7 @@ struct InputOptions {
 struct InputReport {
     bool badInput = false;        // a line was not hex, or a file could not be read
     bool damagedCapture = false;  // a capture ended in a damaged or cut frame
+    bool captureWithoutCamel = false; // a capture held no message taken (said on `errors`)
     uint64_t frames = 0;          // frames read from captures
     std::array<uint64_t, capture::kSkipCount> skips{}; // by reason, all captures
 };
@@ -45,7 +46,9 @@ struct InputReport {
 // "-" is standard input, and with neither --hex arguments nor files only
 // standard input is read.  A file (or standard input) that starts with a
 // pcap or pcapng magic number is read as a capture, frame by frame; any
-// other as hex lines.  Every message goes to onMessage as soon as it is
+// other as hex lines.  Files compressed with gzip, zstd or lz4 are
+// decompressed first.  A capture that holds no message taken is said so
+// on `errors`, with the counts that tell why.  Every message goes to onMessage as soon as it is
 // read.  Lines that are not hex, files that cannot be read and damaged
 // captures are reported on `errors` ("source:line: what", "source: frame
 // N: what"); the rest is still read.
