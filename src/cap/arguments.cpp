@@ -5,6 +5,7 @@
 #include "cap/arguments.h"
 
 #include "cap/charging.h"
+#include "cap/gprs.h"
 #include "cap/rows.h"
 #include "cap/units.h"
 
@@ -271,8 +272,8 @@ constexpr Member kRequestReportBcsmEventArg[] = {
 // ---- Reset Timer (33) -------------------------------------------------------------------------
 
 constexpr Member kResetTimer[] = {
-    el(0x80, "Timer Id", 2304, 0, CAMEL_UNIT(decodeTimerId)),
-    el(0x81, "Timer Value", 1374, 0, CAMEL_UNIT(decodeTimerValue)),
+    timerId(0x80),
+    timerValue(0x81),
     extensions(0xA2),
     callSegmentId(0x83),
 };
@@ -379,6 +380,19 @@ const Argument kArguments[] = {
     {49, &kSpecializedResourceReportTable},
     {65, nullptr}, // SMS Continue
     {70, nullptr}, // GPRS Activity Test
+    {71, &kGprsApplyChargingTable},
+    {72, &kGprsApplyChargingReportTable},
+    {73, &kGprsCancelTable},
+    {74, &kGprsConnectTable},
+    {75, &kGprsContinueTable},
+    {76, &kGprsEntityReleasedTable},
+    {80, &kGprsEventReportTable},
+    {77, &kFurnishChargingInfoGprsTable},
+    {78, &kGprsInitialDpTable},
+    {79, &kGprsReleaseTable},
+    {81, &kRequestReportGprsEventTable},
+    {82, &kGprsResetTimerTable},
+    {83, &kGprsSendChargingInformationTable},
     {86, &kDisconnectForwardConnectionWithArgumentTable},
     {32, &kInitiateCallAttemptTable},
     {88, &kContinueWithArgumentTable},

@@ -27,6 +27,16 @@ consteval Member sendingSideId(uint32_t tag) {
     return el(tag, "Sending Side Id", 1549, 0, CAMEL_UNIT(decodeSendingSideId));
 }
 
+consteval Member tariffSwitchInterval(uint32_t tag) {
+    return el(tag, "Tariff Switch Interval", 1394, 1395, integer(1396, 3));
+}
+consteval Member timerId(uint32_t tag) {
+    return el(tag, "Timer Id", 2304, 0, CAMEL_UNIT(decodeTimerId));
+}
+consteval Member timerValue(uint32_t tag) {
+    return el(tag, "Timer Value", 1374, 0, CAMEL_UNIT(decodeTimerValue));
+}
+
 // The outer SEQUENCE of an argument, a mandatory element walked as an
 // element loop.
 consteval Member sequence(const char *name, uint32_t tagId, uint32_t lengthId,

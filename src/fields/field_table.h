@@ -15,6 +15,7 @@
 #include "fields/names_party.h"
 #include "fields/names_mobile.h"
 #include "fields/names_charging.h"
+#include "fields/names_gprs.h"
 #include "fields/names_tcap.h"
 
 namespace camel {
@@ -976,6 +977,252 @@ inline constexpr FieldDef kFields[] = {
     // ---- SMS operations (62, 65, 64, 61, 60, 66, 63, 67) ----
 
     // ---- GPRS operations (70 to 83) ----
+    // GPRS Apply Charging
+    tagField(2307, "Sequence Tag"),
+    argLength(2308),
+    tagField(2312, "Charging Characteristics Tag"),
+    argLength(2313),
+    enumField(2314, "Choice", names::gprs::kChargingCharacteristics)
+        .display(names::gprs::kChargingCharacteristicsShown),
+    argLength(2315),
+    unsignedField(2317, "Max Transferred Volume(byte)", 0).indented(),
+    argLength(2316),
+    unsignedField(2318, "Max Elapsed Time(second)", 0).indented(),
+    tagField(1268, "PDP ID Tag"),
+    argLength(1269),
+    hexField(1270, "PDP ID").indented().followedBy("h"),
+    // GPRS Apply Charging Report
+    tagField(2320, "Sequence Tag"),
+    argLength(2321),
+    tagField(2328, "Charging Result Tag"),
+    argLength(2329),
+    enumField(2330, "Choice", names::gprs::kChargingResult)
+        .display(names::gprs::kChargingResultShown),
+    argLength(2331),
+    enumField(2333, "Choice", names::gprs::kTransferredVolume),
+    argLength(2334),
+    unsignedField(2335, "Volume If No Tariff Switch(byte)", 0).indented(),
+    argLength(2336),
+    tagField(2341, "Volume Since Last Tariff Switch Tag"),
+    argLength(2342),
+    unsignedField(2343, "Volume Since Last Tariff Switch(byte)", 0).indented(),
+    tagField(2344, "Volume Tariff Switch Interval Tag"),
+    argLength(2345),
+    unsignedField(2346, "Volume Tariff Switch Interval(byte)", 0).indented(),
+    argLength(2332),
+    enumField(2348, "Choice", names::gprs::kElapsedTime),
+    argLength(2349),
+    unsignedField(2350, "Time GPRS IF No Tariff Switch(second)", 0).indented(),
+    argLength(2351),
+    tagField(2356, "Time GPRS Since Last Tariff Switch Tag"),
+    argLength(2357),
+    unsignedField(2358, "  Time GPRS Since LastTariff Switch(second)", 0).indented(),
+    tagField(2359, "Time GPRS Tariff Switch Interval Tag"),
+    argLength(2360),
+    unsignedField(2361, "Time GPRS Tariff Switch Interval(second)", 0).indented(),
+    tagField(2366, "Quality Of Service Tag"),
+    argLength(2367),
+    tagField(2375, "Requested QoS Tag").indented(),
+    argLength(2376),
+    enumField(2377, "Choice", names::gprs::kQosFormat).display(names::gprs::kQosFormatShown),
+    argLength(2379),
+    enumField(2380, "Reliability Class", names::gprs::kReliabilityClass, 3),
+    enumField(2381, "Coding Standard", names::gprs::kDelayClass, 3)
+        .display(names::gprs::kDelayClassShown)
+        .indented(),
+    enumField(2382, "Precedence Class", names::gprs::kPrecedenceClass, 3)
+        .otherwise("Unspecified Subscibed Precedence")
+        .indented(),
+    enumField(2383, "Peak Throughput", names::gprs::kPeakThroughput, 4),
+    enumField(2384, "Mean Throughput", names::gprs::kMeanThroughput, 5),
+    argLength(2385),
+    enumField(2386, "Reliability Class", names::gprs::kLongReliabilityClass, 3)
+        .otherwise("Unack GTP;ack LLC,RLC,protected Data"),
+    enumField(2387, "Coding Standard", names::gprs::kLongDelayClass, 3).indented(),
+    enumField(2388, "Precedence Class", names::gprs::kLongPrecedenceClass, 3).indented(),
+    enumField(2389, "Peak Throughput", names::gprs::kLongPeakThroughput, 4),
+    enumField(2390, "Mean Throughput", names::gprs::kLongMeanThroughput, 5),
+    enumField(2391, "Delivery Of Erroneous SDUs", names::gprs::kErroneousSdus, 3)
+        .otherwise("Reserved"),
+    enumField(2392, "Delivery Order", names::gprs::kDeliveryOrder, 2)
+        .otherwise("Reserved")
+        .indented(),
+    enumField(2393, "Traffic Class", names::gprs::kTrafficClass, 3)
+        .otherwise("Reserved")
+        .indented(),
+    enumField(2394, "Maximum SDU Size", names::gprs::kMaxSduSize.v)
+        .otherwise("Reserved")
+        .indented(),
+    enumField(2395, "Maximum Bit Rate For Uplink", names::gprs::kMaxBitRateUplink.v)
+        .otherwise("Reserved")
+        .indented(),
+    enumField(2396, "Maximum Bit Rate For Downlink", names::gprs::kMaxBitRateDownlink.v)
+        .otherwise("Reserved")
+        .indented(),
+    enumField(2397, "SDU Error Ration", names::gprs::kSduErrorRatio, 4).indented(),
+    enumField(2398, "Residual Bit Error Rate(ber)", names::gprs::kResidualBer, 4).indented(),
+    enumField(2399, "Traffic Handling Priority", names::gprs::kTrafficHandlingPriority, 2),
+    enumField(2400, "Transfer Delay", names::gprs::kTransferDelay.v, 6).indented(),
+    enumField(2401, "Guaranteed Bit Rate For Uplink", names::gprs::kGuaranteedBitRateUplink.v)
+        .otherwise("Reserved")
+        .indented(),
+    enumField(2402, "Guaranteed Bit Rate For Downlink",
+              names::gprs::kGuaranteedBitRateDownlink.v)
+        .otherwise("Reserved")
+        .indented(),
+    tagField(4316, "Requested_QoS_Extension Tag").indented(),
+    argLength(4319),
+    tagField(4320, "Ext2_QoS_Subscribed Tag").indented(),
+    argLength(4321),
+    digitsField(4322, "Ext2_QoS_Subscribed Info").indented(),
+    tagField(4317, "Subscribed_QoS_Extension Tag").indented(),
+    tagField(4318, "Negotiated_QoS_Extension Tag").indented(),
+    tagField(2362, "Active Tag"),
+    argLength(2363),
+    enumField(2364, "Active Value", names::kFalse).indented(),
+    tagField(3881, "Charging Roll Over Tag"),
+    argLength(3882),
+    enumField(3883, "Choice", names::gprs::kChargingRollOver),
+    argLength(3884),
+    enumField(3886, "Choice", names::gprs::kVolumeRollOver),
+    argLength(3887),
+    unsignedField(3888, "RO-volume If No Tariff Switch", 0).indented(),
+    argLength(3889),
+    tagField(3894, "RO-volume Since Last Tariff Switch Tag"),
+    argLength(3895),
+    unsignedField(3896, "RO-volume Since Last Tariff Switch", 0).indented(),
+    tagField(3897, "RO-volume Tariff Switch Interval Tag"),
+    argLength(3898),
+    unsignedField(3899, "RO-volume Tariff Switch Interval", 0).indented(),
+    argLength(3885),
+    enumField(3901, "Choice", names::gprs::kTimeRollOver),
+    argLength(3902),
+    unsignedField(3903, "RO-time GPRS If No Tariff Switch", 0).indented(),
+    argLength(3904),
+    tagField(3909, "RO-time GPRS Since Last Tariff Switch Tag"),
+    argLength(3910),
+    unsignedField(3911, "RO-time GPRS Since Last Tariff Switch", 0).indented(),
+    tagField(3912, "RO-time GPRS Tariff Switch Interval Tag"),
+    argLength(3913),
+    unsignedField(3914, "RO-time GPRS Tariff Switch Interval", 0).indented(),
+    // GPRS Cancel, Connect, Continue, Entity Released
+    tagField(2403, "Sequence Tag"),
+    argLength(2404),
+    tagField(2407, "Sequence Tag"),
+    argLength(2408),
+    tagField(2410, "Access Point Name Tag").indented(),
+    octetLength(2412, "Length"),
+    FieldDef{.id = 2413, .label = "Access Point Name Value", .render = Render::AccessPointName}
+        .key(21, KeyForm::Variable),
+    tagField(2414, "Sequence Tag"),
+    argLength(2415),
+    tagField(2417, "Sequence Tag"),
+    argLength(2418),
+    tagField(2422, "GPRS Cause Tag ").indented(),
+    argLength(2423),
+    FieldDef{.id = 2424,
+             .label = "GPRS Cause Value",
+             .textIndent = 2,
+             .render = Render::Enum,
+             .width = 8,
+             .otherName = "Unspecified"},
+    // GPRS Event Report
+    tagField(2425, "Sequence Tag"),
+    argLength(2426),
+    tagField(2431, "Event Type GPRS Tag").indented(),
+    argLength(2432),
+    enumField(2433, "Event Type Value", names::gprs::kEventTypeGprs).indented(),
+    tagField(2434, "Event Specific Info GPRS Tag"),
+    argLength(2435),
+    enumField(2436, "Choice", names::gprs::kEventSpecificInfo)
+        .display(names::gprs::kEventSpecificInfoShown),
+    argLength(2437),
+    tagField(2218, "Location Infomation GPRS Tag"),
+    argLength(2219),
+    tagField(2440, "Routing Area Identity").indented(),
+    argLength(2441),
+    digitsField(2442, "  MCC").key(18, KeyForm::Word),
+    hexField(2443, "NAS Filler Don't Show", 4),
+    hexField(2448, "  Filler", 4),
+    digitsField(2449, "MNC").indented().key(20, KeyForm::Octet),
+    digitsField(2446, "MNC").indented().spanSelector(2).key(20, KeyForm::Word),
+    unsignedField(2450, "Location Area Code", 16),
+    unsignedField(2451, "RAC"),
+    tagField(2151, "SMS MSC Address Tag"),
+    tagField(2595, "LSA Identity"),
+    argLength(2596),
+    enumField(2597, "LSA Identity Type", names::gprs::kLsaIdentityType, 1)
+        .display(names::gprs::kLsaIdentityTypeShown)
+        .indented(),
+    hexField(2598, "LSA Identity(First part)", 20).indented(),
+    hexField(2599, "LSA Identity(Cont.)", 3).indented(),
+    tagField(2601, "SAI Present Tag"),
+    tagField(2461, "Charging Id").indented(),
+    argLength(2462),
+    hexField(2463, "Charging Id", 0).indented(),
+    tagField(2468, "Enduser Address Tag"),
+    argLength(2469),
+    tagField(2470, "PDP Type Origination").indented(),
+    argLength(2471),
+    hexField(2472, "PDP Type Origination"),
+    tagField(2473, "PDP Type Number"),
+    argLength(2474),
+    hexField(2475, "PDP Type Number"),
+    tagField(2476, "PDP Type Address"),
+    argLength(2477),
+    digitsField(2478, "  PDP Type Address"),
+    tagField(2231, "Time And Timezone").displayId(2230),
+    tagField(2584, "Gsn Address").indented(),
+    argLength(2585),
+    enumField(2586, "Gsn Address Type", names::gprs::kGsnAddressType, 2)
+        .display(names::gprs::kGsnAddressTypeShown),
+    hexField(2589, "Ipv6 Address LENGTH", 6).indented(),
+    digitsField(2590, "Ipv6 Address Body").indented(),
+    hexField(2593, "IPv4 Address LENGTH", 6),
+    FieldDef{.id = 2594, .label = "IPv4 Address Body", .render = Render::Dotted, .width = 32},
+    tagField(2482, "Initiating Entity Tag").indented(),
+    argLength(2483),
+    enumField(2484, "Event Type Value", names::gprs::kInitiatingEntity).indented(),
+    tagField(2603, "Routing Area Update Tag"),
+    tagField(2581, "PDP Initiation Type Tag"),
+    argLength(2582),
+    enumField(2583, "PDP Initiation Type", names::gprs::kPdpInitiationType).indented(),
+    tagField(2602, "Null Window Tag"),
+    // Furnish Charging Info GPRS
+    tagField(2500, "Furnish Charg Info GPRS Tag"),
+    argLength(2501),
+    tagField(2502, "Camel Fci GPRS Bill Cha Char Tag"),
+    argLength(2503),
+    tagField(2504, "Fci GPRS Bill Cha Char Sequence Tag"),
+    argLength(2505),
+    tagField(2506, "Free Format Data Tag"),
+    argLength(2507),
+    // GPRS Initial DP
+    tagField(2509, "Sequence Tag"),
+    argLength(2510),
+    tagField(2154, "SMS MSC Address Tag"),
+    tagField(2019, "IMSI Tag"),
+    tagField(2552, "Sgsn Capabilities Tag"),
+    argLength(2553),
+    enumField(2554, "AOC Support", names::gprs::kAocSupport, 1).indented(),
+    // GPRS Release, Request Report GPRS Event, Reset Timer, Send Charging Information
+    tagField(2555, "Sequence Tag"),
+    argLength(2556),
+    tagField(2558, "Sequence Tag"),
+    argLength(2559),
+    tagField(2561, "GPRS Event Tag"),
+    argLength(2562),
+    tagField(2564, "GPRS Events Tag"),
+    argLength(2565),
+    tagField(2566, "Sequence Tag"),
+    argLength(2567),
+    tagField(2569, "Sequence Tag"),
+    argLength(2570),
+    tagField(2573, "Camel Scigprs Billing Charg Char Tag"),
+    argLength(2575),
+    tagField(2576, "Sequence Tag").indented(),
+    argLength(2578),
+    tagField(1259, "AOC GPRS Tag"),
 
     // ---- Call-control operations of CAP v4 (86, 32, 88, 90, 93, 95, 96, 97) ----
     tagField(4140, "DisconnectForwardConnectionWithArgumentArg Tag"),
@@ -1154,6 +1401,10 @@ constexpr DisplayIds computeDisplayIds() {
     for (size_t i = 0; i < kFieldCount; ++i) {
         const char *label = detail::skipBlanks(kFields[i].label);
         out.id[i] = kFields[i].id;
+        if (kFields[i].shownUnder != 0) {
+            out.id[i] = kFields[i].shownUnder;
+            continue;
+        }
         for (size_t j = 0; j < i; ++j)
             if (detail::sameText(detail::skipBlanks(kFields[j].label), label)) {
                 out.id[i] = kFields[j].id;
