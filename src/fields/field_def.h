@@ -131,6 +131,18 @@ constexpr FieldDef digitsField(uint32_t id, const char *label) {
 constexpr FieldDef charsField(uint32_t id, const char *label) {
     return FieldDef{.id = id, .label = label, .render = Render::Chars, .width = 0};
 }
+// A value every code of which shows one name (`.otherwise(...)`).
+constexpr FieldDef enumField(uint32_t id, const char *label, uint16_t width = 8) {
+    return FieldDef{.id = id, .label = label, .render = Render::Enum, .width = width};
+}
+// Every span "%u", with "." between them (an IPv4 address).
+constexpr FieldDef dottedField(uint32_t id, const char *label, uint16_t width = 32) {
+    return FieldDef{.id = id, .label = label, .render = Render::Dotted, .width = width};
+}
+// Octets the host renders as an access point name.
+constexpr FieldDef accessPointNameField(uint32_t id, const char *label) {
+    return FieldDef{.id = id, .label = label, .render = Render::AccessPointName, .width = 0};
+}
 template <size_t N>
 constexpr FieldDef enumField(uint32_t id, const char *label, const ValueName (&names)[N],
                              uint16_t width = 8) {

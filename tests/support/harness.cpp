@@ -242,26 +242,31 @@ uint32_t growthFlagOf(const DecodeState *st) {
 
 enum class Which { MD, TO, MV, KF };
 
+// One pass over the state of `r`; the key-field pass with room for every key.
+int runPass(Which which, PreRequest &r) {
+    Bytes keyBuffer(kKeyBufferSize, 0);
+    KeyFieldRequest kr{};
+    kr.keyBuffer = keyBuffer.data();
+    kr.dataOffset = HOST_KEY_DATA_START;
+    kr.valueRoom = static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START);
+    kr.state = r.rq.state;
+    switch (which) {
+    case Which::MD: return dpx_PreDecodeMD(&r.rq);
+    case Which::TO: return dpx_PreDecodeTO(&r.rq);
+    case Which::MV: return dpx_PreDecodeMV(&r.rq);
+    case Which::KF: return KFE_3gpp_camel_400(&kr);
+    }
+    return -1;
+}
+
 // Runs one pass with pu_Realloc failing at call n; returns whether the
 // failure was reached.
 bool runFailing(const Bytes &message, Which which, uint32_t n) {
     State s(message);
     shrinkArrays(s.st);
     PreRequest r(s.st);
-    Bytes keyBuffer(kKeyBufferSize, 0);
-    KeyFieldRequest kr{};
-    kr.keyBuffer = keyBuffer.data();
-    kr.dataOffset = HOST_KEY_DATA_START;
-    kr.valueRoom = static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START);
-    kr.state = s.st;
     host_SetReallocFailAt(n);
-    int result = 0;
-    switch (which) {
-    case Which::MD: result = dpx_PreDecodeMD(&r.rq); break;
-    case Which::TO: result = dpx_PreDecodeTO(&r.rq); break;
-    case Which::MV: result = dpx_PreDecodeMV(&r.rq); break;
-    case Which::KF: result = KFE_3gpp_camel_400(&kr); break;
-    }
+    const int result = runPass(which, r);
     const bool reached = host_ReallocCalls() >= n;
     host_SetReallocFailAt(0);
     host_ClearRecords();
@@ -294,6 +299,28 @@ uint32_t checkReallocFailures(const Bytes &message) {
         }
     }
     return points;
+}
+
+uint32_t checkAccessPointNameFailure(const Bytes &message) {
+    uint32_t ended = 0;
+    host_SetAccessPointNameResult(0);
+    for (Which w : {Which::MD, Which::TO, Which::MV, Which::KF}) {
+        State s(message);
+        PreRequest r(s.st);
+        const int result = runPass(w, r);
+        host_ClearRecords();
+        if (w == Which::MD || w == Which::TO) {
+            EXPECT_EQ(result, 0) << "pass " << int(w);
+            EXPECT_EQ(r.rq.layerIndex, 0u);
+            EXPECT_EQ(r.rq.layerEntries[0].lastBit, 0u);
+            EXPECT_EQ(s.st->errorFlags & 0x70000000u, 0u) << "no growth failure";
+            ended += result == 0 ? 1 : 0;
+        } else {
+            EXPECT_EQ(result, 1) << "pass " << int(w) << " renders no name";
+        }
+    }
+    host_SetAccessPointNameResult(1);
+    return ended;
 }
 
 Bytes tlv(uint8_t tag, const Bytes &content) {

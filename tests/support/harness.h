@@ -97,6 +97,12 @@ KeyRun runKeys(const Bytes &message, uint16_t room);
 // layer index.  Returns the number of failure points exercised.
 uint32_t checkReallocFailures(const Bytes &message);
 
+// Makes pu_access_point_name fail and checks that the decoded-field and
+// display passes end with 0 without closing their layer entry, and that
+// the message-view and key-field passes (which render no name) return 1.
+// Returns the number of passes that ended with 0.
+uint32_t checkAccessPointNameFailure(const Bytes &message);
+
 // The decoded-field texts of a message joined by newlines.
 std::string textDump(const Decoded &d);
 
