@@ -310,15 +310,14 @@ VALUES = (
 
 RULE_TEXT = dict(ch.RULE_TEXT, **{
     'gprsms-class-not-decoded': 'GPRS Initial DP with a Gprsms Class element (A5): its unit is '
-                                'built elsewhere; the element and the rest of the argument are '
-                                'skipped (flag 0x10) and no value is compared',
+                                'not among the GPRS rows yet; the element loop steps over it '
+                                '(flag 0x10, its octets in no field)',
     'long-qos-format-not-compared': 'long QoS format: read as the short format\'s three octets '
                                     'then octets 4 to 11; tshark reads MAP\'s Ext-QoS-Subscribed '
                                     '(allocation priority first), so its values are not compared',
 })
 FLAGGING_PAYLOAD_RULES = dict(ch.FLAGGING_PAYLOAD_RULES, **{'gprsms-class-not-decoded': 0x10})
 ROWS = [cc._row(r) for r in VALUES]
-NO_ROWS = [cc._row(('nothing', None, (), (), t_int, o_num))]
 
 
 def _argument(root):
@@ -339,6 +338,7 @@ def payload(root, stats, hexmsg):
         notes.add('external-indefinite')
     if _ms_class(arg):
         notes.add('gprsms-class-not-decoded')
+        stats.rule('gprsms-class-not-decoded', hexmsg)
     return arg.off, arg.end, notes
 
 
@@ -348,41 +348,11 @@ def _ms_class(arg):
     return arg.tag == 0x30 and all(arg.kid(t) is not None for t in (0xA5, 0x83, 0x84))
 
 
-def _carries_ms_class(hexmsg, parse_node):
-    try:
-        arg = _argument(parse_node(bytes.fromhex(hexmsg), 0))
-    except (ValueError, IndexError):
-        return False
-    return arg is not None and _ms_class(arg)
-
-
 def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
-    """call_control.check over this module's corpus and values; messages
-    carrying a Gprsms Class element are checked for coverage under their rule
-    and their values are not compared."""
-    label = lambda group: group.split('/')[0]
-    picks = [_carries_ms_class(h, parse_node) for _, h in corpus]
-    parts = []
-    for ms_class in (False, True):
-        sel = [i for i, p in enumerate(picks) if p == ms_class]
-        parts.append(cc.check([corpus[i] for i in sel], [pdml[i] for i in sel],
-                              [oracle[i] for i in sel], [ours[i] for i in sel], parse_node,
-                              tcap_rules, payload, label, NO_ROWS if ms_class else ROWS,
-                              FLAGGING_PAYLOAD_RULES))
-    stats = parts[0]
-    extra = parts[1]
-    for k, (n, a) in extra.compared.items():
-        c = stats.compared.setdefault(k, [0, 0])
-        c[0] += n
-        c[1] += a
-    for k, (n, ex) in extra.rules.items():
-        stats.rules.setdefault(k, [0, ex])[0] += n
-    stats.failures += extra.failures
-    for k, v in extra.by_value.items():
-        stats.by_value.setdefault(k, {}).update(v)
-    for (group, hexmsg), ms_class, tfields in zip(corpus, picks, pdml):
-        if ms_class:
-            stats.rule('gprsms-class-not-decoded', hexmsg)
+    """call_control.check over this module's corpus, payloads and values."""
+    stats = cc.check(corpus, pdml, oracle, ours, parse_node, tcap_rules, payload,
+                     lambda group: group.split('/')[0], ROWS, FLAGGING_PAYLOAD_RULES)
+    for (_, hexmsg), tfields in zip(corpus, pdml):
         if any(t[0] == 'camel.long_QoS_format' for t in tfields):
             stats.rule('long-qos-format-not-compared', hexmsg)
     return stats

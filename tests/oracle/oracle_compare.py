@@ -102,10 +102,6 @@ RULE_TEXT = {
     'asn1-indefinite': 'indefinite [0] single-ASN.1-type wrapper: no dialogue PDU decoded',
     'pdu-indefinite': 'indefinite AARQ/AARE/ABRT: PDU identifier only, no members '
                       '(ACN, result, abort source)',
-    'acn-partial': 'ACN with a CAP octet other than 0/0x14/0x15 (CAP v4): arcs read '
-                   'down to the CAP octet only',
-    'result-after-partial-acn': 'AARE after a partly read ACN: result not decoded '
-                                '(the ACN\'s last arcs are read as the next identifier)',
     'cp-indefinite-kinds': 'indefinite component portion: at most one component of '
                            'each kind, in the order Invoke, ReturnResult, ReturnError, Reject',
     'component-indefinite-ends-list': 'indefinite-length component: the list ends after it',
@@ -316,7 +312,7 @@ def expect(data, root, ora, notes):
         if dlg.indef and cp is not None:
             notes.add('dialogue-indefinite')
             components_reachable = False
-        dialogue_expectations(data, dlg, tc, uni, e, notes)
+        dialogue_expectations(dlg, tc, uni, e, notes)
 
     if cp is not None and components_reachable:
         component_expectations(cp, ora.get('components') or [], e, notes)
@@ -325,7 +321,7 @@ def expect(data, root, ora, notes):
     return e
 
 
-def dialogue_expectations(data, dlg, tc, uni, e, notes):
+def dialogue_expectations(dlg, tc, uni, e, notes):
     ext = dlg.kid(0x28)
     asn1 = ext.kid(0xA0) if ext is not None else None
     if asn1 is None:
@@ -338,22 +334,9 @@ def dialogue_expectations(data, dlg, tc, uni, e, notes):
     if pdu.indef and not uni:
         notes.add('pdu-indefinite')
         return
-    acn = pdu.kid(0xA1)
-    complete = True
-    if acn is not None:
-        oid = acn.kids[0].content(data)
-        cap = oid[4]
-        complete = (cap == 0 and len(oid) >= 7) or (cap in (0x14, 0x15) and oid[5] == 3)
-        if complete:
-            e['acn'] = tc.get('acn')
-        else:
-            notes.add('acn-partial')
-            e['acn'] = '.'.join((tc.get('acn') or '').split('.')[:6])
+    e['acn'] = tc.get('acn')
     if pdu.tag == 0x61:
-        if complete:
-            e['result'] = tc.get('result')
-        else:
-            notes.add('result-after-partial-acn')
+        e['result'] = tc.get('result')
     e['abort_source'] = tc.get('abort_source')
 
 
