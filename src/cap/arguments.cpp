@@ -7,6 +7,7 @@
 #include "cap/arguments_sms.h"
 #include "cap/charging.h"
 #include "cap/mobile.h"
+#include "cap/gprs.h"
 #include "cap/rows.h"
 #include "cap/units.h"
 
@@ -385,6 +386,19 @@ const Argument kArguments[] = {
     {63, &kRequestReportSmsEventTable},
     {67, &kResetTimerSmsTable},
     {70, nullptr}, // GPRS Activity Test
+    {71, &kGprsApplyChargingTable},
+    {72, &kGprsApplyChargingReportTable},
+    {73, &kGprsCancelTable},
+    {74, &kGprsConnectTable},
+    {75, &kGprsContinueTable},
+    {76, &kGprsEntityReleasedTable},
+    {80, &kGprsEventReportTable},
+    {77, &kFurnishChargingInfoGprsTable},
+    {78, &kGprsInitialDpTable},
+    {79, &kGprsReleaseTable},
+    {81, &kRequestReportGprsEventTable},
+    {82, &kGprsResetTimerTable},
+    {83, &kGprsSendChargingInformationTable},
     {86, &kDisconnectForwardConnectionWithArgumentTable},
     {32, &kInitiateCallAttemptTable},
     {88, &kContinueWithArgumentTable},

@@ -5,6 +5,7 @@
 #include "cap/arguments_sms.h"
 
 #include "cap/bit_fields.h"
+#include "cap/gprs.h"
 #include "cap/mobile.h"
 #include "cap/ms_capability.h"
 #include "cap/rows.h"
@@ -216,6 +217,7 @@ constexpr Member kInitialDpSms[] = {
     eventTypeSms(0x83),
     imsi(0x84, 2019),
     locationInformation(0xA5, 2030),
+    locationInformationGprs(0xA6),
     isdnAddressString(0x87, 2152),
     timeAndTimezone(0x88, 2231),
     el(0x89, "TP Short Messagesubscriber Info", 2241, 2242, CAMEL_UNIT(submissionInfo)),

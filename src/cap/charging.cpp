@@ -12,10 +12,6 @@ namespace camel {
 
 namespace {
 
-consteval Member tariffSwitchInterval(uint32_t tag) {
-    return el(tag, "Tariff Switch Interval", 1394, 1395, integer(1396, 3));
-}
-
 // ---- Bursts and the audible indicator ------------------------------------------------
 
 // Every member of a burst is a small integer counted in its own unit (a
@@ -106,8 +102,6 @@ constexpr Member kAocBeforeAnswer[] = {
     caiGsm0224(),
     el(0xA1, "AOC Subsequent", 1264, 1265, table(kAocSubsequentMembers)),
 };
-constexpr MemberTable kAocBeforeAnswerMembers = members(Walk::Loop, kAocBeforeAnswer);
-
 constexpr Member kSciBillingCharging[] = {
     alt(0xA0, "AOC Before Answer", 1260, table(kAocBeforeAnswerMembers)),
     alt(0xA1, "AOC After Answer", 1265, table(kAocSubsequentMembers)),
@@ -182,6 +176,7 @@ constexpr MemberTable kBurstTable = members(Walk::Loop, kBurst);
 constexpr MemberTable kAChBillingChargingCharacteristicsTable =
     members(Walk::Loop, kAChBillingChargingCharacteristics);
 constexpr MemberTable kTimeInformationTable = members(Walk::Choice, kTimeInformation, 1412);
+constexpr MemberTable kAocBeforeAnswerMembers = members(Walk::Loop, kAocBeforeAnswer);
 constexpr MemberTable kSciBillingChargingTable =
     members(Walk::Choice, kSciBillingCharging, 1257);
 constexpr MemberTable kGapCriteriaTable = members(Walk::Choice, kGapCriteria, 1442);

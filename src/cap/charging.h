@@ -27,6 +27,9 @@ consteval Member burst(uint32_t tag) { return el(tag, "Burst", 4244, 4245, table
 // Send Charging Information's billing characteristics: a choice field,
 // then the advice-of-charge alternative.
 extern const MemberTable kSciBillingChargingTable;
+// Advice of charge before answer (and of GPRS): CAI GSM0224 and the
+// optional AOC Subsequent.
+extern const MemberTable kAocBeforeAnswerMembers;
 
 // ---- Arguments, in the dispatcher's order ----------------------------------------------
 extern const MemberTable kApplyChargingTable;                    // 35

@@ -154,7 +154,7 @@ constexpr MemberTable kCellIdOrLaiChoice = members(Walk::FirstMatch, kCellIdOrLa
 
 constexpr Member kLocationInformation[] = {
     el(0x02, "Age Of Location Information", 2044, 2045, integer(2046, 2)),
-    el(0x80, "Geographical Information", 2047, 2048, CAMEL_UNIT(geographicalInformation)),
+    el(0x80, "Geographical Information", 2047, 2048, CAMEL_UNIT(decodeGeographicalInformation)),
     el(0x81, "VLR Number", 2059, 2060, CAMEL_UNIT(isdnAddressBody)),
     el(0x82, "Location Number", 2061, 2062, CAMEL_UNIT(locationNumber)),
     el(0xA3, "Cell Id Or Sai Or LAI", 2070, 2071, table(kCellIdOrLaiChoice)),
@@ -171,5 +171,24 @@ constexpr Member kLocationInformationBody =
 } // namespace
 
 CAMEL_BODY_UNIT(decodeLocationInformation, kLocationInformationBody);
+
+// The cell global id, service area id or location area id as bare octets
+// (the GPRS location information's form): the MCC-MNC-LAC block, then the
+// cell identity when the element holds one.
+template <Pass P>
+int decodeCellIdOrLaiOctets(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    if (!mccMncBlock<P>(st, ctx, rq, kLocationArea))
+        return 0;
+    if (ctx->present == 0 || st->remainingBits == 0)
+        return 1;
+    return fixedOctets<P>(st, ctx, rq, fx(2088), 2);
+}
+CAMEL_INSTANTIATE_UNIT(decodeCellIdOrLaiOctets, DecodeState *, ElementContext *);
+
+template <Pass P>
+int decodeGeographicalInformation(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
+    return geographicalInformation<P>(st, ctx, rq);
+}
+CAMEL_INSTANTIATE_UNIT(decodeGeographicalInformation, DecodeState *, ElementContext *);
 
 } // namespace camel

@@ -56,6 +56,9 @@ consteval Member miscCallInfo(uint32_t tag) {
 consteval Member monitorMode(uint32_t tag) {
     return el(tag, "Monitor Mode", 1907, 1908, octet(1909));
 }
+consteval Member tariffSwitchInterval(uint32_t tag) {
+    return el(tag, "Tariff Switch Interval", 1394, 1395, integer(1396, 3));
+}
 consteval Member timerId(uint32_t tag) {
     return el(tag, "Timer Id", 2304, 0, CAMEL_UNIT(decodeTimerId));
 }

@@ -70,6 +70,8 @@ CAMEL_DECLARE_UNIT(decodeCugIndex);
 CAMEL_DECLARE_UNIT(decodeImsi);
 CAMEL_DECLARE_UNIT(decodeSubscriberState);          // after its length
 CAMEL_DECLARE_UNIT(decodeLocationInformation);
+CAMEL_DECLARE_UNIT(decodeGeographicalInformation); // after its length
+CAMEL_DECLARE_UNIT(decodeCellIdOrLaiOctets);       // after its length
 CAMEL_DECLARE_UNIT(decodeIsdnAddressString);
 CAMEL_DECLARE_UNIT(decodeCalledPartyBcdNumber);
 CAMEL_DECLARE_UNIT(decodeTimeAndTimezone);

@@ -129,6 +129,15 @@ inline void renderValue(const FieldDef &f, const FieldRecord &field, TextBuf &ou
             out.append(&shown, 1);
         }
         break;
+    case Render::Dotted:
+        for (uint32_t i = 0; i < field.spansReported; ++i) {
+            if (i != 0)
+                out.append(".", 1);
+            out.decimal(field.spans[i].value);
+        }
+        break;
+    case Render::AccessPointName:
+        break; // the host appends the name (see report)
     }
 }
 
@@ -169,15 +178,20 @@ int report(DecodeState *st, Request<P> *rq, FieldIndex index) {
             text.blanks(f.textIndent);
             text.append(f.label);
             text.append("=", 1);
-            text.append(value.data, value.len);
+        }
+        text.append(value.data, value.len);
+        if constexpr (P == Pass::Decoded)
             text.append(f.suffix);
+        // An access point name is rendered by the host; its failure ends the pass.
+        if (f.render == Render::AccessPointName &&
+            pu_access_point_name(text.data, st->field.value, st) == 0)
+            return 0;
+        if constexpr (P == Pass::Decoded)
             pu_AddDecodedFieldsData(rq, st->field.spansReported, st->field.spans, text.data,
                                     detail::spanSelector(f, st->field.spansReported),
                                     st->field.label, f.id, 0, 0);
-        } else {
-            text.append(value.data, value.len);
+        else
             pu_AddFieldsToDisplayData(rq, text.data, kDisplayIds.id[index]);
-        }
     } else if constexpr (P == Pass::MessageView) {
         noteStatus<P>(st, rq);
     } else {
@@ -228,19 +242,39 @@ int bitsField(DecodeState *st, Request<P> *rq, FieldIndex f, uint32_t offset, ui
     return finishField<P>(st, rq, f, consumed);
 }
 
-// A field of `width` bits at `offset` that must fit in the window: when the
-// bits are not there the element is marked absent and nothing is shown.
+// A field of `spans` runs of `width` bits each from `offset` bits after the
+// cursor, the first run most significant (value = value << width | run),
+// consuming `consumed` bits (0: the field only shows bits a later field of
+// the octet consumes).  It must fit in the window: when the bits are not
+// there the element is marked absent and nothing is shown.
 template <Pass P>
-int fittedBitsField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
-                    uint32_t offset, uint32_t width, uint32_t consumed) {
+int spansField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+               uint32_t offset, uint32_t width, uint32_t spans, uint32_t consumed) {
     if (ctx->present == 0)
         return 1;
-    const uint32_t need = offset + width > consumed ? offset + width : consumed;
-    if (!room(st, need)) {
+    const uint32_t end = offset + width * spans;
+    if (!room(st, end > consumed ? end : consumed)) {
         ctx->present = 0;
         return 1;
     }
-    return bitsField<P>(st, rq, f, offset, width, consumed);
+    beginField(st, f);
+    if (!ensureSpans(st, spans - 1))
+        return 0;
+    uint32_t value = 0;
+    for (uint32_t i = 0; i < spans; ++i) {
+        const uint32_t run = setSpan(st, i, offset + width * i, offset + width * (i + 1) - 1);
+        value = width >= 32 ? run : (value << width) | run;
+    }
+    st->field.value = value;
+    return finishField<P>(st, rq, f, consumed);
+}
+
+// A field of `width` bits at `offset` that must fit in the window (one run
+// of spansField).
+template <Pass P>
+int fittedBitsField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f,
+                    uint32_t offset, uint32_t width, uint32_t consumed) {
+    return spansField<P>(st, ctx, rq, f, offset, width, 1, consumed);
 }
 
 // A one-octet field (tag, fixed length octet, one-octet value).  Emitted

@@ -35,6 +35,8 @@ int decodeValue(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Valu
         return walkTable<P>(st, ctx, rq, *v.table);
     case ValueKind::Unit:
         return v.unit.call<P>(st, ctx, rq);
+    case ValueKind::Bits:
+        return readBits<P>(st, ctx, rq, *v.bits);
     }
     return 1;
 }
@@ -90,6 +92,16 @@ int loop(DecodeState *st, ElementContext *ctx, Request<P> *rq, const MemberTable
 }
 
 } // namespace
+
+template <Pass P>
+int readBits(DecodeState *st, ElementContext *ctx, Request<P> *rq, const BitLayout &b) {
+    for (uint32_t i = 0; i < b.count && ctx->present != 0; ++i) {
+        const BitField &r = b.rows[i];
+        if (!spansField<P>(st, ctx, rq, r.field, r.offset, r.width, r.spans, r.consumed))
+            return 0;
+    }
+    return 1;
+}
 
 template <Pass P>
 int decodeMember(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Member &m,
@@ -165,6 +177,7 @@ int walkTable(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Member
 }
 
 #define CAMEL_INSTANTIATE_WALKER(P)                                                          \
+    template int readBits<P>(DecodeState *, ElementContext *, Request<P> *, const BitLayout &);   \
     template int walkTable<P>(DecodeState *, ElementContext *, Request<P> *,                  \
                               const MemberTable &);                                           \
     template int decodeMember<P>(DecodeState *, ElementContext *, Request<P> *, const Member &, \

@@ -50,9 +50,26 @@ enum class ValueKind : uint8_t {
     Bcd,        // at most `limit` digits, low half of each octet first
     Table,      // a child member table
     Unit,       // a hand-written unit
+    Bits,       // a bit layout: fields at fixed bit offsets, see BitField
 };
 
 struct MemberTable;
+
+// One field of a bit layout: `spans` runs of `width` bits from `offset`
+// bits after the cursor, the first run most significant, then `consumed`
+// bits consumed.  The fields of one octet show its bits without consuming
+// them (consumed 0) until the last, which consumes the octet.
+struct BitField {
+    FieldIndex field = kNoField;
+    uint8_t offset = 0;
+    uint8_t width = 8;
+    uint8_t spans = 1;
+    uint8_t consumed = 0;
+};
+struct BitLayout {
+    const BitField *rows = nullptr;
+    uint8_t count = 0;
+};
 
 struct Value {
     ValueKind kind = ValueKind::None;
@@ -60,6 +77,7 @@ struct Value {
     uint8_t limit = 0;
     const MemberTable *table = nullptr;
     UnitRef unit{};
+    const BitLayout *bits = nullptr;
 };
 
 // The identifier "read without a value check" under a tag override.
@@ -108,6 +126,21 @@ consteval Value halfOctets(uint32_t id, uint8_t limit) {
 consteval Value bcd(uint32_t id, uint8_t digits) { return Value{ValueKind::Bcd, fx(id), digits}; }
 constexpr Value unitValue(UnitRef unit) { return Value{ValueKind::Unit, kNoField, 0, nullptr, unit}; }
 consteval Value table(const MemberTable &t) { return Value{ValueKind::Table, kNoField, 0, &t}; }
+consteval Value bits(const BitLayout &b) {
+    return Value{ValueKind::Bits, kNoField, 0, nullptr, UnitRef{}, &b};
+}
+
+// A bit-layout row: field id, offset and width of the bits shown, bits
+// consumed; `spans` runs of `width` bits when the value is read in pieces.
+consteval BitField bitField(uint32_t id, uint8_t offset, uint8_t width, uint8_t consumed,
+                            uint8_t spans = 1) {
+    return BitField{fx(id), offset, width, spans, consumed};
+}
+template <size_t N>
+consteval BitLayout layout(const BitField (&rows)[N]) {
+    static_assert(N > 0 && N < 256, "a bit layout has 1 to 255 fields");
+    return BitLayout{rows, static_cast<uint8_t>(N)};
+}
 
 // A row: identifier as written (0x9F32 for the two octets 9F 32), element
 // name, tag and length field ids (0: none), value.
@@ -161,6 +194,10 @@ consteval Member body(const char *name, uint32_t lengthId, Value value) {
 // Walks table `t` in the current window with the caller's context.
 template <Pass P>
 int walkTable(DecodeState *st, ElementContext *ctx, Request<P> *rq, const MemberTable &t);
+
+// Reads the fields of bit layout `b` at the cursor.
+template <Pass P>
+int readBits(DecodeState *st, ElementContext *ctx, Request<P> *rq, const BitLayout &b);
 
 // Whether row `m`'s identifier is next (a peek; nothing consumed).
 bool memberTagNext(DecodeState *st, const Member &m);

@@ -17,6 +17,8 @@ enum class Render : uint8_t {
     Digits,      // "%x" of every span, in span order
     Enum,        // the value's name; empty when it has none
     Chars,       // every span as a character (IA5), '.' for what cannot be shown
+    Dotted,      // "%u" of every span, with "." between them (an IPv4 address)
+    AccessPointName, // the host's pu_access_point_name renders the spans
 };
 
 // Where a key field's value goes in the key buffer.
@@ -53,6 +55,7 @@ struct FieldDef {
     int8_t keyEntry = -1;          // key table entry, -1 for none
     KeyForm keyForm = KeyForm::None;
     uint8_t selector = 0xFF;       // span selector override; 0xFF: derived
+    uint32_t shownUnder = 0;       // display id override; 0: derived from the label
 
     // Modifiers used in the declaration table.
     constexpr FieldDef indented() const {
@@ -81,6 +84,13 @@ struct FieldDef {
     constexpr FieldDef otherwise(const char *name) const {
         FieldDef f = *this;
         f.otherName = name;
+        return f;
+    }
+    // A field the display pass reports under another field's display id
+    // than the label rule gives.
+    constexpr FieldDef displayId(uint32_t id) const {
+        FieldDef f = *this;
+        f.shownUnder = id;
         return f;
     }
     constexpr FieldDef spanSelector(uint8_t s) const {
@@ -120,6 +130,18 @@ constexpr FieldDef digitsField(uint32_t id, const char *label) {
 }
 constexpr FieldDef charsField(uint32_t id, const char *label) {
     return FieldDef{.id = id, .label = label, .render = Render::Chars, .width = 0};
+}
+// A value every code of which shows one name (`.otherwise(...)`).
+constexpr FieldDef enumField(uint32_t id, const char *label, uint16_t width = 8) {
+    return FieldDef{.id = id, .label = label, .render = Render::Enum, .width = width};
+}
+// Every span "%u", with "." between them (an IPv4 address).
+constexpr FieldDef dottedField(uint32_t id, const char *label, uint16_t width = 32) {
+    return FieldDef{.id = id, .label = label, .render = Render::Dotted, .width = width};
+}
+// Octets the host renders as an access point name.
+constexpr FieldDef accessPointNameField(uint32_t id, const char *label) {
+    return FieldDef{.id = id, .label = label, .render = Render::AccessPointName, .width = 0};
 }
 template <size_t N>
 constexpr FieldDef enumField(uint32_t id, const char *label, const ValueName (&names)[N],

@@ -23,10 +23,10 @@ the message and that the decoder does not crash.
 
 The call-control arguments (call_control.py beside this script), the
 charging, call gap and announcement arguments, results and errors
-(charging.py) and the SMS arguments (sms.py) are checked value by value
-against tshark on messages with random values, and every octet of each
-argument, result or error must lie in a reported field of a clean
-four-pass decode.
+(charging.py), the SMS arguments (sms.py) and the GPRS operations' arguments
+(gprs.py) are checked value by value against tshark on messages with random
+values, and every octet of each argument, result or error must lie in a
+reported field of a clean four-pass decode.
 
 Exit status: 0 all agree, 1 disagreements or a crash, 77 skipped (the
 reference tools or tshark are missing).  Python 3 standard library only.
@@ -590,7 +590,7 @@ def main(argv=None):
     ap.add_argument('--mutations', type=int, default=2000,
                     help='malformed messages decoded with all passes (default 2000)')
     ap.add_argument('--per-op', type=int, default=200,
-                    help='messages per call-control, charging or SMS operation, result '
+                    help='messages per call-control, charging, SMS or GPRS operation, result '
                          'operation code and error code (default 200)')
     ap.add_argument('--seed', type=int, default=29078)
     ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
@@ -615,6 +615,7 @@ def main(argv=None):
     import call_control  # noqa: E402
     import charging  # noqa: E402
     import sms  # noqa: E402
+    import gprs  # noqa: E402
 
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
@@ -623,7 +624,8 @@ def main(argv=None):
     # corpus, checks tshark's and our outputs and reports.
     suites = [(name, module, module.build_corpus(args.per_op, args.seed))
               for name, module in (('call control', call_control), ('charging', charging),
-                                   ('sms', sms))]
+                                   ('sms', sms),
+                                   ('gprs', gprs))]
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)

@@ -289,6 +289,30 @@ uint32_t growthFlagOf(const DecodeState *st) {
 
 enum class Which { MD, TO, MV, KF };
 
+// A key-field request over `state` with room for every key, in `buffer`.
+KeyFieldRequest keyRequest(Bytes &buffer, DecodeState *state) {
+    buffer.assign(kKeyBufferSize, 0);
+    KeyFieldRequest kr{};
+    kr.keyBuffer = buffer.data();
+    kr.dataOffset = HOST_KEY_DATA_START;
+    kr.valueRoom = static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START);
+    kr.state = state;
+    return kr;
+}
+
+// One pass over the state of `r`; the key-field pass with room for every key.
+int runPass(Which which, PreRequest &r) {
+    Bytes keyBuffer;
+    KeyFieldRequest kr = keyRequest(keyBuffer, r.rq.state);
+    switch (which) {
+    case Which::MD: return dpx_PreDecodeMD(&r.rq);
+    case Which::TO: return dpx_PreDecodeTO(&r.rq);
+    case Which::MV: return dpx_PreDecodeMV(&r.rq);
+    case Which::KF: return KFE_3gpp_camel_400(&kr);
+    }
+    return -1;
+}
+
 // Runs one pass with pu_Realloc failing at call n; returns whether the
 // failure was reached.
 template <class Passes>
@@ -296,12 +320,8 @@ bool runFailing(const Bytes &message, const Passes &passes, Which which, uint32_
     State s(message);
     shrinkArrays(s.st);
     PreRequest r(s.st);
-    Bytes keyBuffer(kKeyBufferSize, 0);
-    KeyFieldRequest kr{};
-    kr.keyBuffer = keyBuffer.data();
-    kr.dataOffset = HOST_KEY_DATA_START;
-    kr.valueRoom = static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START);
-    kr.state = s.st;
+    Bytes keyBuffer;
+    KeyFieldRequest kr = keyRequest(keyBuffer, s.st);
     host_SetReallocFailAt(n);
     int result = 0;
     switch (which) {
@@ -349,6 +369,28 @@ uint32_t checkReallocFailures(const Bytes &message) { return checkReallocFailure
 
 uint32_t checkReallocFailures(const Bytes &message, const MemberTable &table) {
     return checkReallocFailuresWith(message, TableWalk{table, 0});
+}
+
+uint32_t checkAccessPointNameFailure(const Bytes &message) {
+    uint32_t ended = 0;
+    host_SetAccessPointNameResult(0);
+    for (Which w : {Which::MD, Which::TO, Which::MV, Which::KF}) {
+        State s(message);
+        PreRequest r(s.st);
+        const int result = runPass(w, r);
+        host_ClearRecords();
+        if (w == Which::MD || w == Which::TO) {
+            EXPECT_EQ(result, 0) << "pass " << int(w);
+            EXPECT_EQ(r.rq.layerIndex, 0u);
+            EXPECT_EQ(r.rq.layerEntries[0].lastBit, 0u);
+            EXPECT_EQ(s.st->errorFlags & 0x70000000u, 0u) << "no growth failure";
+            ended += result == 0 ? 1 : 0;
+        } else {
+            EXPECT_EQ(result, 1) << "pass " << int(w) << " renders no name";
+        }
+    }
+    host_SetAccessPointNameResult(1);
+    return ended;
 }
 
 Bytes tlv(uint8_t tag, const Bytes &content) {

@@ -110,6 +110,12 @@ uint32_t checkReallocFailures(const Bytes &message);
 // The same for a member table walked as walk() walks it.
 uint32_t checkReallocFailures(const Bytes &message, const MemberTable &table);
 
+// Makes pu_access_point_name fail and checks that the decoded-field and
+// display passes end with 0 without closing their layer entry, and that
+// the message-view and key-field passes (which render no name) return 1.
+// Returns the number of passes that ended with 0.
+uint32_t checkAccessPointNameFailure(const Bytes &message);
+
 // The decoded-field texts of a message joined by newlines.
 std::string textDump(const Decoded &d);
 

@@ -23,6 +23,9 @@ void walk(const camel::MemberTable &t, std::set<const camel::MemberTable *> &see
         meet(m.tagField);
         meet(m.lengthField);
         meet(m.value.field);
+        if (m.value.bits != nullptr)
+            for (uint32_t b = 0; b < m.value.bits->count; ++b)
+                meet(m.value.bits->rows[b].field);
         if (m.value.table != nullptr)
             walk(*m.value.table, seen, met);
     }
