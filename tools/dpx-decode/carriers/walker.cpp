@@ -215,7 +215,6 @@ void FrameWalker::sccp(Bytes message, const Origin &origin, MessageSink &sink) {
     m.callingSsn = s.calling.ssn;
     m.calledGt = s.called.gt;
     m.callingGt = s.calling.gt;
-    if (!selected(m))
     countSsn(m.hasCalledSsn, m.calledSsn);
     // Segments are put together only when their message may be taken.
     if (!options_.camelDialogues && !listed(m)) {
