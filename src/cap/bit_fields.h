@@ -6,16 +6,13 @@
 #include <cstdint>
 
 #include "engine/emit.h"
+#include "engine/members.h"
 
 namespace camel {
 
-// One bit field of an octet: its field, the offset of its lowest bit from
-// the octet's first bit (ITU bit n is offset n - 1) and its width.
-struct BitField {
-    FieldIndex field;
-    uint8_t offset;
-    uint8_t width;
-};
+// A BitField row (engine/members.h) names the field, the offset of its
+// lowest bit from the octet's first bit (ITU bit n is offset n - 1) and its
+// width; the helpers below read the rows of one octet in order.
 
 // Fields of one octet read in place, in the order they are shown; with
 // `finish` the last one moves the cursor on to the next octet.  `values`,
