@@ -5,7 +5,9 @@
 #   make build   configure and build the native preset (build/native)
 #   make demo    deps + build, then decode the bundled sample messages and a
 #                sample capture
-#   make test    deps, then build and test the native, asan and m32 presets
+#   make test    deps, then build and test the native, asan and m32 presets,
+#                then build the fuzz preset and run each fuzz target briefly
+#                over its seeds (test-fuzz)
 #   make bench   build, then run the benchmarks
 #   make bench-capture   build, then dpx-decode against tshark on a capture
 #   make clean   remove build/
@@ -14,9 +16,12 @@ SHELL := /bin/bash
 .DEFAULT_GOAL := build
 
 PRESETS := native asan m32
+# clang and its libFuzzer runtime serve the fuzz preset only (make fuzz,
+# make fuzz-capture and the fuzz smoke run of make test).
+FUZZ_PACKAGES := clang libclang-rt-14-dev
 DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
                 libbenchmark-dev nlohmann-json3-dev libcli11-dev libpcap-dev tshark \
-                python3
+                python3 $(FUZZ_PACKAGES)
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 APT_INSTALL := $(SUDO) apt-get update -qq; \
                $(SUDO) env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends
@@ -35,7 +40,7 @@ SAMPLES := $(sort $(wildcard samples/*.txt))
 DEMO_CAPTURES := samples/callflow-m3ua.pcap
 DEMO_ARGS ?= $(SAMPLES) $(DEMO_CAPTURES)
 
-.PHONY: deps build demo test bench clean $(addprefix test-,$(PRESETS))
+.PHONY: deps build demo test test-fuzz bench clean $(addprefix test-,$(PRESETS))
 
 deps:
 	@missing=""; \
@@ -77,7 +82,8 @@ test: deps
 	        && ctest --preset "$$preset" \
 	        || { echo "make test: $$preset FAILED" >&2; exit 1; }; \
 	done; \
-	echo "make test: $(PRESETS) passed$${m32:+ (m32 programs run $$m32)}"
+	$(MAKE) --no-print-directory test-fuzz || { echo "make test: fuzz FAILED" >&2; exit 1; }; \
+	echo "make test: $(PRESETS) and fuzz passed$${m32:+ (m32 programs run $$m32)}"
 
 $(addprefix test-,$(PRESETS)): test-%:
 	@if [ $* = m32 ]; then $(M32_CHECK); echo "m32 programs run $$m32"; fi
@@ -101,13 +107,15 @@ clean:
 	rm -rf build
 
 # ---- fuzzing -------------------------------------------------------------------
-# make fuzz: the project's packages plus clang and libFuzzer (FUZZ_PACKAGES,
-# installed here only), then the fuzz preset (build/fuzz) and camel_fuzz for
-# FUZZ_TIME seconds over build/fuzz/corpus (new inputs), build/fuzz/seeds
-# (samples/*.txt) and fuzz/corpus.  Crash inputs land in build/fuzz/.
-FUZZ_PACKAGES := clang libclang-rt-14-dev
+# make fuzz: the fuzz preset (build/fuzz: clang, libFuzzer, ASan+UBSan), then
+# camel_fuzz for FUZZ_TIME seconds over build/fuzz/corpus (new inputs),
+# build/fuzz/seeds (samples/*.txt) and fuzz/corpus.  Crash inputs land in
+# build/fuzz/.
 FUZZ_TIME ?= 300
 FUZZ_ARGS ?= -max_len=512 -dict=fuzz/camel.dict
+# make test-fuzz (part of make test): each target for FUZZ_SMOKE_TIME seconds,
+# its seeds first, new inputs kept in a scratch directory only.
+FUZZ_SMOKE_TIME ?= 15
 
 .PHONY: fuzz fuzz-capture fuzz-tools
 fuzz: fuzz-tools
@@ -117,20 +125,17 @@ fuzz: fuzz-tools
 # make fuzz-capture: capture_fuzz, dpx-decode's frame walker (link layer to
 # TCAP message), over build/fuzz/capture-corpus and seeds from samples/*.pcap.
 fuzz-capture: fuzz-tools
-	mkdir -p build/fuzz/capture-corpus
 	build/fuzz/capture_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
 	    -max_len=4096 build/fuzz/capture-corpus build/fuzz/capture-seeds
 
+test-fuzz: fuzz-tools
+	rm -rf build/fuzz/smoke && mkdir -p build/fuzz/smoke/camel build/fuzz/smoke/capture
+	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_SMOKE_TIME) -artifact_prefix=build/fuzz/ \
+	    -print_final_stats=1 $(FUZZ_ARGS) build/fuzz/smoke/camel build/fuzz/seeds fuzz/corpus
+	build/fuzz/capture_fuzz -max_total_time=$(FUZZ_SMOKE_TIME) -artifact_prefix=build/fuzz/ \
+	    -print_final_stats=1 -max_len=4096 build/fuzz/smoke/capture build/fuzz/capture-seeds
+
 fuzz-tools: deps
-	@missing=""; \
-	for pkg in $(FUZZ_PACKAGES); do \
-	    dpkg -s "$$pkg" 2>/dev/null | grep -q '^Status: install ok installed' \
-	        || missing="$$missing $$pkg"; \
-	done; \
-	if [ -n "$$missing" ]; then \
-	    echo "make fuzz: installing$$missing"; \
-	    $(APT_INSTALL) $$missing; \
-	fi
 	cmake --preset fuzz
 	cmake --build --preset fuzz -j2
-	mkdir -p build/fuzz/corpus
+	mkdir -p build/fuzz/corpus build/fuzz/capture-corpus

@@ -1115,12 +1115,54 @@ inline constexpr FieldDef kFields[] = {
 
 inline constexpr size_t kFieldCount = sizeof(kFields) / sizeof(kFields[0]);
 
+// A field's position in the catalogue, as units and member tables hold it.
+using FieldIndex = uint16_t;
+static_assert(kFieldCount < 0xFFFF, "field positions are 16-bit");
+inline constexpr FieldIndex kNoField = 0xFFFF;
+
+// The derivations below run at compile time over the whole table.  Each is
+// linear in the number of fields (a lookup array by id, a hash over the
+// labels), so that they stay inside the compilers' default constexpr limits
+// however many fields are declared.
+
+namespace detail {
+constexpr uint32_t idLimit() {
+    uint32_t limit = 0;
+    for (const FieldDef &f : kFields)
+        limit = f.id >= limit ? f.id + 1 : limit;
+    return limit;
+}
+} // namespace detail
+
+// One past the largest declared field id.
+inline constexpr uint32_t kIdLimit = detail::idLimit();
+
+// Catalogue position by field id (kNoField for an id not declared), and the
+// first id declared twice (0 when every id is declared once).
+struct IdIndex {
+    FieldIndex at[kIdLimit];
+    uint32_t duplicate;
+};
+constexpr IdIndex computeIdIndex() {
+    IdIndex out{};
+    for (uint32_t id = 0; id < kIdLimit; ++id)
+        out.at[id] = kNoField;
+    for (size_t i = 0; i < kFieldCount; ++i) {
+        FieldIndex &slot = out.at[kFields[i].id];
+        if (slot != kNoField && out.duplicate == 0)
+            out.duplicate = kFields[i].id;
+        slot = static_cast<FieldIndex>(i);
+    }
+    return out;
+}
+inline constexpr IdIndex kIdIndex = computeIdIndex();
+static_assert(kIdIndex.duplicate == 0, "a field id is declared twice (kIdIndex.duplicate names it)");
+
 // Position of a field id in the catalogue; kFieldCount when it is unknown.
 constexpr size_t fieldIndex(uint32_t id) {
-    for (size_t i = 0; i < kFieldCount; ++i)
-        if (kFields[i].id == id)
-            return i;
-    return kFieldCount;
+    if (id >= kIdLimit || kIdIndex.at[id] == kNoField)
+        return kFieldCount;
+    return kIdIndex.at[id];
 }
 
 namespace detail {
@@ -1136,29 +1178,42 @@ constexpr bool sameText(const char *a, const char *b) {
     }
     return *a == *b;
 }
+// FNV-1a of a text.
+constexpr uint32_t textHash(const char *s) {
+    uint32_t h = 2166136261u;
+    for (; *s != '\0'; ++s)
+        h = (h ^ static_cast<uint8_t>(*s)) * 16777619u;
+    return h;
+}
+constexpr size_t labelSlots() {
+    size_t n = 64;
+    while (n < 2 * kFieldCount)
+        n *= 2;
+    return n;
+}
 } // namespace detail
-
-// A field's position in the catalogue, as units and member tables hold it.
-using FieldIndex = uint16_t;
-static_assert(kFieldCount < 0xFFFF, "field positions are 16-bit");
-inline constexpr FieldIndex kNoField = 0xFFFF;
 
 // The display id of every field, by catalogue position: the id of the first
 // catalogue entry whose label equals the field's label with leading blanks
-// ignored.
+// ignored.  One pass in catalogue order over an open-addressing table of the
+// labels met so far: the first field with a label claims its slot.
 struct DisplayIds {
     uint32_t id[kFieldCount];
 };
 constexpr DisplayIds computeDisplayIds() {
+    constexpr size_t kSlots = detail::labelSlots();
+    FieldIndex first[kSlots]{};
+    for (size_t s = 0; s < kSlots; ++s)
+        first[s] = kNoField;
     DisplayIds out{};
     for (size_t i = 0; i < kFieldCount; ++i) {
         const char *label = detail::skipBlanks(kFields[i].label);
-        out.id[i] = kFields[i].id;
-        for (size_t j = 0; j < i; ++j)
-            if (detail::sameText(detail::skipBlanks(kFields[j].label), label)) {
-                out.id[i] = kFields[j].id;
-                break;
-            }
+        size_t s = detail::textHash(label) & (kSlots - 1);
+        while (first[s] != kNoField && !detail::sameText(detail::skipBlanks(kFields[first[s]].label), label))
+            s = (s + 1) & (kSlots - 1);
+        if (first[s] == kNoField)
+            first[s] = static_cast<FieldIndex>(i);
+        out.id[i] = kFields[first[s]].id;
     }
     return out;
 }
@@ -1184,22 +1239,15 @@ inline void fieldIdNotDeclared() {} // not constexpr: using it stops compilation
 } // namespace detail
 
 // The catalogue position of a declared field id, for tables built at
-// compile time; an undeclared id does not compile.
+// compile time; an undeclared id does not compile.  (Inside a template,
+// where some compilers reject a consteval call on a template parameter,
+// use Field<Id>::index.)
 consteval FieldIndex fx(uint32_t id) {
     const size_t i = fieldIndex(id);
     if (i >= kFieldCount)
         detail::fieldIdNotDeclared();
     return static_cast<FieldIndex>(i);
 }
-
-constexpr bool idsAreUnique() {
-    for (size_t i = 0; i < kFieldCount; ++i)
-        for (size_t j = i + 1; j < kFieldCount; ++j)
-            if (kFields[i].id == kFields[j].id)
-                return false;
-    return true;
-}
-static_assert(idsAreUnique(), "a field id is declared twice");
 
 // The declaration of a field known at compile time.
 template <uint32_t Id>
