@@ -453,6 +453,15 @@ inline constexpr FieldDef kFields[] = {
     tagField(2008, "Generic Numbers Tag"),
     tagField(1957, "Service Interaction Ind Two Tag"),
     tagField(1939, "Charge Number Tag"),
+    argLength(1941),
+    enumField(1942, "Nature Of Address Ind", names::kChargeNatureOfAddress, 7).indented(),
+    enumField(1943, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(1944, "Numbering Plan Indicator", names::kPrivateNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    digitsField(3600, "Address Signal").indented().key(12, KeyForm::Variable),
+    hexField(3601, "Filler", 4),
+    digitsField(3603, "Address Signal").indented().key(12, KeyForm::Variable),
     tagField(1946, "CUG Interlock Tag", 16),
     tagField(1950, "CUG Outgoing Access Tag", 16),
     enumField(1659, "Number Qualifier Indicator", names::kNumberQualifier)
@@ -589,9 +598,6 @@ inline constexpr FieldDef kFields[] = {
     argLength(1160),
     tagField(1612, "Calling Party Number Tag"),
     tagField(1635, "Cg Encountered Tag"),
-    digitsField(3600, "Address Signal").indented().key(12, KeyForm::Variable),
-    hexField(3601, "Filler", 4),
-    digitsField(3603, "Address Signal").indented().key(12, KeyForm::Variable),
     argLength(1613),
     enumField(1617, "Nature Of Address Ind", names::kNatureOfAddress, 7).indented(),
     enumField(1618, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
@@ -601,8 +607,8 @@ inline constexpr FieldDef kFields[] = {
         .indented()
         .display(names::kSpare7Shown),
     enumField(1622, "Ni Ind", names::kNiIndicator, 1).indented(),
-    digitsField(1631, "Calling Party Num").indented().key(15, KeyForm::Variable),
     digitsField(1628, "Calling Party Num").indented().key(15, KeyForm::Variable),
+    digitsField(1631, "Calling Party Num").indented().key(15, KeyForm::Variable),
     hexField(1629, "Filler", 4),
     tagField(1638, "Location Number Tag"),
     tagField(1671, "High Layer Compatibility Tag"),
@@ -624,12 +630,6 @@ inline constexpr FieldDef kFields[] = {
     enumField(1827, "Original Redirection Reasons", names::kOriginalRedirectionReason, 4).indented(),
     unsignedField(1828, "Redirection Counter", 3).indented(),
     enumField(1829, "Redirecting Reason", names::kRedirectingReason, 4).indented(),
-    argLength(1941),
-    enumField(1942, "Nature Of Address Ind", names::kChargeNatureOfAddress, 7).indented(),
-    enumField(1943, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
-    enumField(1944, "Numbering Plan Indicator", names::kPrivateNumberingPlan, 3)
-        .indented()
-        .display(names::kSpare7Shown),
     argLength(1639),
     enumField(3557, "Nature Of Address Ind", names::kLocationNatureOfAddress, 7)
         .indented()
@@ -808,8 +808,9 @@ inline constexpr FieldDef kFields[] = {
     digitsField(2079, "  MCC"),
     hexField(2080, "NAS Filler Don't Show", 4),
     hexField(2085, "  Filler", 4),
-    digitsField(2086, "MNC").indented(),
+    // The three-digit MNC comes first: every "MNC" is shown under 2083.
     digitsField(2083, "MNC").indented().spanSelector(2),
+    digitsField(2086, "MNC").indented(),
     unsignedField(2087, "Location Area Code", 16).indented(),
     hexField(2088, "Cell Identity", 16).indented(),
     tagField(2137, "Called Party Bcd Number Tag", 16),

@@ -7,6 +7,7 @@
 #include <string>
 
 #include "output.h"
+#include "tables.h"
 
 namespace dpxdecode {
 namespace {
@@ -96,7 +97,8 @@ void displayJson(Writer &w, const DisplayPassOut &d) {
     w.raw(",").key("fields").raw("[");
     bool first = true;
     for (const DisplayOut &f : d.fields) {
-        w.raw(first ? "{" : ",{").key("displayId").number(f.displayId).raw(",").key("text").string(f.text).raw("}");
+        w.raw(first ? "{" : ",{").key("displayId").number(f.displayId).raw(",").key("text").string(f.text);
+        w.raw(",").key("label").string(catalogueLabel(f.displayId)).raw("}");
         first = false;
     }
     w.raw("]}");

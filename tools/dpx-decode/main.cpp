@@ -20,6 +20,7 @@
 #include "module.h"
 #include "output.h"
 #include "summary.h"
+#include "tables.h"
 
 namespace {
 
@@ -73,6 +74,15 @@ bool parseSsnList(const std::string &text, std::bitset<256> &out) {
     return true;
 }
 
+// --tables: the description tables, as a host reads them.
+int printTables(const dpxdecode::Module &module) {
+    if (!dpxdecode::writeTables(std::cout, module)) {
+        std::cerr << "dpx-decode: the module does not serve every description table\n";
+        return kExitNoModule;
+    }
+    return std::cout.flush() ? 0 : kExitBadInput;
+}
+
 } // namespace
 
 int main(int argc, char **argv) {
@@ -106,6 +116,8 @@ int main(int argc, char **argv) {
     app.add_flag("--ansi", ansi, "captures: ANSI MTP3 routing labels and SCCP addresses");
     app.add_flag("--summary", summary, "one line per message instead of the passes' output");
     app.add_flag("--stats", stats, "counts by message type, operation, result, error, flag and skip reason");
+    bool tables = false;
+    app.add_flag("--tables", tables, "print the module's description tables as one JSON object and exit");
 
     try {
         app.parse(argc, argv);
@@ -134,6 +146,11 @@ int main(int argc, char **argv) {
         std::cerr << "dpx-decode: cannot load module: " << error << '\n';
         return kExitNoModule;
     }
+
+    if (tables)
+        return printTables(module);
+    if (!dpxdecode::loadCatalogue(module))
+        std::cerr << "dpx-decode: the module serves no field catalogue: labels left empty\n";
 
     std::ios::sync_with_stdio(false);
     static char outBuffer[1 << 16];
