@@ -14,7 +14,7 @@
 #include <string>
 #include <vector>
 
-#include "../tools/dpx-decode/hex_line.h"
+#include "../tools/dpx-decode/input/hex_line.h"
 #include "dpx_camel.h"
 #include "dpx_standin_host.h"
 

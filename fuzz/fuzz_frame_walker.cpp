@@ -24,8 +24,8 @@
 #include <cstdlib>
 #include <vector>
 
-#include "capture/link.h"
-#include "capture/walker.h"
+#include "carriers/link.h"
+#include "carriers/walker.h"
 
 namespace {
 

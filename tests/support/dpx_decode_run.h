@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <sys/wait.h>
+#include <unistd.h>
 
 #include <cstdio>
 #include <fstream>
@@ -40,9 +41,10 @@ inline std::string quote(const std::string &s) {
     return q + "'";
 }
 
-// A file in the test's temporary directory, named after the running test.
+// A file in the test's temporary directory, named after the running test and
+// this process, so that test runs of several builds at once do not collide.
 inline std::string tempFile(const std::string &name, const std::string &content) {
-    const std::string path = ::testing::TempDir() + "dpx_decode_" +
+    const std::string path = ::testing::TempDir() + "dpx_decode_" + std::to_string(getpid()) + "_" +
                              ::testing::UnitTest::GetInstance()->current_test_info()->name() + "_" + name;
     std::ofstream(path, std::ios::binary) << content;
     return path;

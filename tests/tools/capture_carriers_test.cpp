@@ -10,8 +10,8 @@
 #include <string>
 #include <vector>
 
-#include "capture/link.h"
-#include "capture/walker.h"
+#include "carriers/link.h"
+#include "carriers/walker.h"
 #include "capture_writer.h"
 
 namespace {

@@ -5,7 +5,7 @@
 // direction, bundling, ...), so one input file can describe a whole call
 // flow; dpx-decode sees such a line as a comment.
 
-#include "../dpx-decode/hex_line.h"
+#include "../dpx-decode/input/hex_line.h"
 #include "capture_writer.h"
 
 #include <cerrno>

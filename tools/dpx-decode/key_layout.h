@@ -10,7 +10,7 @@
 
 #include "dpx_camel.h"
 #include "dpx_standin_host.h"
-#include "hex_line.h"
+#include "input/hex_line.h"
 
 namespace dpxdecode {
 

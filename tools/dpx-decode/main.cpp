@@ -15,12 +15,12 @@
 #include <string>
 #include <vector>
 
-#include "hex_line.h"
-#include "input.h"
+#include "input/hex_line.h"
+#include "input/input.h"
 #include "module.h"
-#include "output.h"
-#include "summary.h"
 #include "tables.h"
+#include "views/output.h"
+#include "views/summary.h"
 
 namespace {
 

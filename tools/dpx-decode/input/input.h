@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "capture/walker.h"
+#include "carriers/walker.h"
 
 namespace dpxdecode {
 

@@ -5,7 +5,7 @@
 #include <iosfwd>
 #include <string>
 
-#include "input.h"
+#include "input/input.h"
 #include "module.h"
 
 namespace dpxdecode {

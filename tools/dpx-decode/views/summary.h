@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "input.h"
+#include "input/input.h"
 #include "module.h"
 
 namespace dpxdecode {
