@@ -4,7 +4,9 @@
 // rows call are in the other files of this folder.
 #include "cap/arguments.h"
 
+#include "cap/arguments_sms.h"
 #include "cap/charging.h"
+#include "cap/mobile.h"
 #include "cap/rows.h"
 #include "cap/units.h"
 
@@ -62,9 +64,6 @@ consteval Member eventTypeBcsm(uint32_t tag) {
 }
 consteval Member callingPartyNumber(uint32_t tag) {
     return el(tag, "Calling Party Number", 1612, 0, CAMEL_UNIT(decodeCallingPartyNumber));
-}
-consteval Member isdnAddressString(uint32_t tag) {
-    return el(tag, "ISDN Address String", 2159, 0, CAMEL_UNIT(decodeIsdnAddressString));
 }
 
 // Destination Routing Address: called party numbers while the next
@@ -208,7 +207,7 @@ constexpr Member kEventReportBcsm[] = {
     eventTypeBcsm(0x80),
     el(0xA2, "Event Specific Info BCSM", 1558, 0, CAMEL_UNIT(decodeEventSpecificInfoBcsm)),
     receivingSideId(0xA3),
-    el(0xA4, "Misc Call Info", 1602, 0, CAMEL_UNIT(decodeMiscCallInfo)),
+    miscCallInfo(0xA4),
     extensions(0xA5),
 };
 constexpr MemberTable kEventReportBcsmLoop = members(Walk::Loop, kEventReportBcsm);
@@ -218,7 +217,7 @@ constexpr Member kEventReportBcsmArg[] = {
 // ---- Initial DP (0) -------------------------------------------------------------------------
 
 constexpr Member kInitialDp[] = {
-    el(0x80, "Service Key", 1609, 0, CAMEL_UNIT(decodeServiceKey)),
+    serviceKey(0x80),
     el(0x82, "Called Party Number", 1614, 0, CAMEL_UNIT(decodeCalledPartyNumber)),
     callingPartyNumber(0x83),
     callingPartysCategory(0x85),
@@ -240,16 +239,16 @@ constexpr Member kInitialDp[] = {
     el(0x9F2D, "CUG Index", 1191, 0, CAMEL_UNIT(decodeCugIndex)),
     cugInterlock(0x9F2E, 1946),
     cugOutgoingAccess(0x9F2F, 1950),
-    el(0x9F32, "IMSI", 2018, 0, CAMEL_UNIT(decodeImsi)),
+    imsi(0x9F32, 2018),
     el(0xBF33, "Subscriber State", 2110, 2111, CAMEL_UNIT(decodeSubscriberState)),
-    el(0xBF34, "Location Information", 2031, 0, CAMEL_UNIT(decodeLocationInformation)),
+    locationInformation(0xBF34, 2031),
     el(0xBF35, "Ext Basic Service Code", 2125, 2126, CAMEL_UNIT(decodeExtBasicServiceCode)),
-    el(0x9F36, "Call Reference Number", 2133, 2134, halfOctets(2135, 8)),
+    callReferenceNumber(0x9F36, 2133, 2134, 2135),
     isdnAddressString(0x9F37),
-    el(0x9F38, "Called Party Bcd Number", 2137, 0, CAMEL_UNIT(decodeCalledPartyBcdNumber)),
-    el(0x9F39, "Timeand Timezone", 2230, 0, CAMEL_UNIT(decodeTimeAndTimezone)),
+    calledPartyBcdNumber(0x9F38, 2137),
+    timeAndTimezone(0x9F39, 2230),
     el(0x9F3A, "Gsm Forwarding Pending", 1194, 1195, none()),
-    el(0xBF3B, "Initial DP Arg Extension", 1196, 1197, CAMEL_UNIT(decodeInitialDpArgExtension)),
+    el(0xBF3B, "Initial DP Arg Extension", 1196, 1197, table(kInitialDpArgExtensionTable)),
 };
 constexpr MemberTable kInitialDpLoop = members(Walk::Loop, kInitialDp);
 constexpr Member kInitialDpArg[] = {sequence("Initial DP", 1159, 1160, kInitialDpLoop)};
@@ -271,8 +270,8 @@ constexpr Member kRequestReportBcsmEventArg[] = {
 // ---- Reset Timer (33) -------------------------------------------------------------------------
 
 constexpr Member kResetTimer[] = {
-    el(0x80, "Timer Id", 2304, 0, CAMEL_UNIT(decodeTimerId)),
-    el(0x81, "Timer Value", 1374, 0, CAMEL_UNIT(decodeTimerValue)),
+    timerId(0x80),
+    timerValue(0x81),
     extensions(0xA2),
     callSegmentId(0x83),
 };
@@ -295,7 +294,7 @@ constexpr Member kInitiateCallAttempt[] = {
     legId(0xA5),
     callSegmentId(0x86),
     callingPartyNumber(0x9E),
-    el(0x9F33, "Call Reference Number", 4175, 4176, halfOctets(4177, 8)),
+    callReferenceNumber(0x9F33, 4175),
     isdnAddressString(0x9F34),
     el(0x9F35, "suppress_T_CSI", 4333, 4334, none()),
 };
@@ -377,7 +376,14 @@ const Argument kArguments[] = {
     {33, &kResetTimerTable},
     {46, &kSendChargingInformationTable},
     {49, &kSpecializedResourceReportTable},
+    {62, &kConnectSmsTable},
     {65, nullptr}, // SMS Continue
+    {64, &kEventReportSmsTable},
+    {61, &kFurnishChargingInformationSmsTable},
+    {60, &kInitialDpSmsTable},
+    {66, &kReleaseSmsTable},
+    {63, &kRequestReportSmsEventTable},
+    {67, &kResetTimerSmsTable},
     {70, nullptr}, // GPRS Activity Test
     {86, &kDisconnectForwardConnectionWithArgumentTable},
     {32, &kInitiateCallAttemptTable},

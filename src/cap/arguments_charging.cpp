@@ -69,9 +69,9 @@ constexpr Member kCallGapArg[] = {sequence("Call Gap", 1084, 1085, kCallGapLoop)
 // ---- Furnish Charging Information (34): an OCTET STRING holding the billing data ----------------
 
 constexpr Member kFciBillingCharging[] = {
-    el(0x80, "Free Format Data", 2186, 2187, halfOctets(2188, 52)),
+    freeFormatData(0x80),
     sendingSideId(0xA1),
-    el(0x82, "Append freee FORMAT data", 2189, 2190, CAMEL_UNIT(decodeAppendFreeFormatData)),
+    appendFreeFormatData(0x82),
 };
 constexpr MemberTable kFciBillingChargingLoop = members(Walk::Loop, kFciBillingCharging);
 constexpr Member kFciBillingChargingCharacteristics[] = {
@@ -123,11 +123,14 @@ constexpr MemberTable kSendChargingInformationLoop = members(Walk::Loop, kSendCh
 constexpr Member kSendChargingInformationArg[] = {
     sequence("Send Charging Information", 1234, 1235, kSendChargingInformationLoop)};
 
-// ---- Specialized Resource Report (49): a NULL under one of two identifiers ----------------------
+// ---- Specialized Resource Report (49) ---------------------------------------------------------
+// A choice field over the first two octets: one of the two NULLs of the
+// CAP v4 choice, whose length follows, or the whole plain NULL (05 00) of
+// the earlier phases, shown with no name.
 
 constexpr Member kSpecializedResourceReport[] = {
-    el(0x9F32, "allAnnouncementsComplete", 1238, 1240, none()),
-    el(0x9F33, "firstAnnouncementStarted", 1238, 1240, none()),
+    alt(0x9F32, "allAnnouncementsComplete", 1240, none()),
+    alt(0x9F33, "firstAnnouncementStarted", 1240, none()),
 };
 
 // ---- Play Tone (97) ---------------------------------------------------------------------------
@@ -156,7 +159,7 @@ constexpr MemberTable kPromptAndCollectUserInformationTable =
     argument(kPromptAndCollectUserInformationArg);
 constexpr MemberTable kSendChargingInformationTable = argument(kSendChargingInformationArg);
 constexpr MemberTable kSpecializedResourceReportTable =
-    members(Walk::FirstMatch, kSpecializedResourceReport);
+    members(Walk::Choice, kSpecializedResourceReport, 1238);
 constexpr MemberTable kPlayToneTable = argument(kPlayToneArg);
 
 } // namespace camel

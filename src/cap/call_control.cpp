@@ -10,6 +10,7 @@
 // alternative whose identifier has been consumed.  Hand-written code is
 // kept for bit-level layouts and for the event-specific choice, whose
 // identifiers are one or two octets long.
+#include "cap/rows.h"
 #include "cap/units.h"
 #include "engine/members.h"
 
@@ -226,7 +227,7 @@ constexpr MemberTable kDpSpecificCriteria =
     members(Walk::Choice, kDpSpecificCriteriaAlternatives, 1912);
 constexpr Member kBcsmEventRows[] = {
     el(0x80, "Event Type BCSM", 1555, 0, CAMEL_UNIT(decodeEventTypeBcsm)),
-    el(0x81, "Monitor Mode", 1907, 1908, octet(1909)),
+    monitorMode(0x81),
     el(0xA2, "Leg Id", 1541, 0, CAMEL_UNIT(decodeLegId)),
     el(0xBE, "DP Specific Criteria", 1910, 1911, table(kDpSpecificCriteria)),
     null(0x9F32, "automaticRearm", 4331, 4332),

@@ -116,10 +116,6 @@ constexpr Member kSciBillingCharging[] = {
 
 // ---- Call gap --------------------------------------------------------------------------------
 
-consteval Member serviceKey(uint32_t tag) {
-    return el(tag, "Service Key", 1609, 0, CAMEL_UNIT(decodeServiceKey));
-}
-
 constexpr Member kGapOnService[] = {serviceKey(0x80)};
 constexpr MemberTable kGapOnServiceMembers = members(Walk::Loop, kGapOnService);
 constexpr Member kCalledAddressAndService[] = {

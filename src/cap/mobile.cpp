@@ -3,6 +3,7 @@
 // DP argument extension, the announcement flags, the collected-information
 // request and the timers.  Location information is in location.cpp.
 #include "cap/mobile.h"
+#include "cap/rows.h"
 #include "cap/units.h"
 
 namespace camel {
@@ -61,12 +62,6 @@ constexpr MemberTable kSubscriberStateChoice = members(Walk::FirstMatch, kSubscr
 
 // ---- Initial DP Arg Extension -----------------------------------------------------------
 
-// An octet string member whose tag, length and value fields have
-// consecutive ids; its value takes all content octets.
-consteval Member octetString(uint32_t tag, const char *name, uint32_t tagId) {
-    return el(tag, name, tagId, tagId + 1, halfOctets(tagId + 2, 255));
-}
-
 constexpr Member kInitialDpArgExtension[] = {
     el(0x80, "ISDN Address String", 2149, 0, CAMEL_UNIT(decodeIsdnAddressString)),
     el(0x81, "Called Party Number", 1614, 0, CAMEL_UNIT(decodeCalledPartyNumber)),
@@ -80,7 +75,6 @@ constexpr Member kInitialDpArgExtension[] = {
     octetString(0x89, "Low Layer Compatibility", 4226),
     octetString(0x8A, "Low Layer Compatibility", 4226),
 };
-constexpr MemberTable kInitialDpArgExtensionLoop = members(Walk::Loop, kInitialDpArgExtension);
 
 // ---- Announcement flags and timers -----------------------------------------------------------
 
@@ -129,6 +123,7 @@ CAMEL_BODY_UNIT(decodeCollectInfo, kCollectInfo);
 
 // Units called right after their element's length field.
 CAMEL_TABLE_UNIT(decodeSubscriberState, kSubscriberStateChoice);
-CAMEL_TABLE_UNIT(decodeInitialDpArgExtension, kInitialDpArgExtensionLoop);
+
+constexpr MemberTable kInitialDpArgExtensionTable = members(Walk::Loop, kInitialDpArgExtension);
 
 } // namespace camel

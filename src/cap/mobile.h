@@ -42,6 +42,9 @@ struct MccMncFields {
 template <Pass P>
 int mccMncBlock(DecodeState *st, ElementContext *ctx, Request<P> *rq, const MccMncFields &f);
 
+// The members of the Initial DP argument extension, an element loop.
+extern const MemberTable kInitialDpArgExtensionTable;
+
 // Extension Container, from its length field on.
 template <Pass P>
 int decodeExtensionContainer(DecodeState *st, ElementContext *ctx, Request<P> *rq);

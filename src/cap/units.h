@@ -73,7 +73,6 @@ CAMEL_DECLARE_UNIT(decodeLocationInformation);
 CAMEL_DECLARE_UNIT(decodeIsdnAddressString);
 CAMEL_DECLARE_UNIT(decodeCalledPartyBcdNumber);
 CAMEL_DECLARE_UNIT(decodeTimeAndTimezone);
-CAMEL_DECLARE_UNIT(decodeInitialDpArgExtension);    // after its length
 CAMEL_DECLARE_UNIT(decodeTimerId);
 CAMEL_DECLARE_UNIT(decodeTimerValue);
 CAMEL_DECLARE_UNIT(decodeDisconnectFromIpForbidden);

@@ -262,17 +262,21 @@ inline int delimitedConstruct(DecodeState *st, ElementContext *ctx, Request<P> *
 
 // ---- Choice -----------------------------------------------------------------------
 
-// A "Choice" field: the alternative's identifier octet, reported by name
-// and kept in `choiceTag` for the selection that follows.
+// A "Choice" field: the alternative's identifier, reported by name and kept
+// in `choiceTag` for the selection that follows.  A field of two octets
+// reads them first octet low, as tag tests do, and keeps them in
+// `choiceTag` as written (9F 32 as 0x9F32), as alternatives are declared.
 template <Pass P>
 int choiceField(DecodeState *st, ElementContext *ctx, Request<P> *rq, FieldIndex f) {
-    if (ctx->present == 0 || !room(st, 8)) {
+    const uint32_t width = kFields[f].width == 16 ? 16 : 8;
+    if (ctx->present == 0 || !room(st, width)) {
         ctx->present = 0;
         return 1;
     }
-    if (!bitsField<P>(st, rq, f, 0, 8, 8))
+    if (!bitsField<P>(st, rq, f, 0, width, width))
         return 0;
-    g_scratch<P>.choiceTag = st->field.value;
+    const uint32_t v = st->field.value;
+    g_scratch<P>.choiceTag = width == 16 ? ((v & 0xFFu) << 8) | (v >> 8) : v;
     return 1;
 }
 template <Pass P, uint32_t Id>

@@ -164,4 +164,31 @@ inline LengthPeek peekLength(const DecodeState *st, uint32_t offsetBits) {
     return len;
 }
 
+// The bits of the whole element at the cursor (identifier, definite length
+// and contents) when it is well formed and lies in the window, else 0: an
+// identifier 00 (end-of-contents), a tag number over more than four octets
+// or with a leading zero octet, an indefinite length or one that does not
+// fit, contents past the window.
+inline uint64_t wholeElementBits(const DecodeState *st) {
+    if (st->remainingBits < 8 || octetAt(st, 0) == 0)
+        return 0;
+    uint32_t idBits = 8;
+    if ((octetAt(st, 0) & 0x1Fu) == 0x1Fu) {
+        uint32_t next = 0x80;
+        while ((next & 0x80u) != 0) {
+            if (idBits > 32 || st->remainingBits < idBits + 8)
+                return 0;
+            next = octetAt(st, idBits);
+            if (idBits == 8 && (next & 0x7Fu) == 0)
+                return 0;
+            idBits += 8;
+        }
+    }
+    const LengthPeek len = peekLength(st, idBits);
+    if (!len.fits || len.octetCount == 0)
+        return 0;
+    const uint64_t bits = idBits + len.bits + len.value * 8;
+    return bits <= st->remainingBits ? bits : 0;
+}
+
 } // namespace camel

@@ -63,16 +63,22 @@ inline int ensureSpans(DecodeState *st, uint32_t highest) {
     return 1;
 }
 
-// Fills span `index` over the bits [cursor + from, cursor + to] (offsets
-// from the cursor, to >= from, at most 32 bits) and returns its value.
-inline uint32_t setSpan(DecodeState *st, uint32_t index, uint32_t from, uint32_t to) {
+// Fills span `index` over the message bits [first, last] (positions, last
+// >= first, at most 32 bits) and returns its value.
+inline uint32_t setSpanAt(DecodeState *st, uint32_t index, uint32_t first, uint32_t last) {
     ValueSpan &s = st->field.spans[index];
-    s.firstBit = st->bitCursor + from;
-    s.lastBit = st->bitCursor + to;
-    s.value = ExtractBits(st->buffer, s.firstBit, s.lastBit);
+    s.firstBit = first;
+    s.lastBit = last;
+    s.value = ExtractBits(st->buffer, first, last);
     s.flags = 0;
     st->field.spansFilled = index + 1;
     return s.value;
+}
+
+// Fills span `index` over the bits [cursor + from, cursor + to] (offsets
+// from the cursor) and returns its value.
+inline uint32_t setSpan(DecodeState *st, uint32_t index, uint32_t from, uint32_t to) {
+    return setSpanAt(st, index, st->bitCursor + from, st->bitCursor + to);
 }
 
 namespace detail {

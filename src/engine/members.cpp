@@ -39,8 +39,24 @@ int decodeValue(DecodeState *st, ElementContext *ctx, Request<P> *rq, const Valu
     return 1;
 }
 
-// The element loop: sweeps over the rows until N consecutive misses, the
-// window is used up, or a sweep makes no progress.
+// An element that no row names, at the cursor: when it is whole and inside
+// the window it is stepped over by its own length and flagged as bits not
+// decoded, so that the members after it are still found.  False when it is
+// malformed or runs past the window.
+bool stepOverUnknown(DecodeState *st) {
+    const uint64_t bits = wholeElementBits(st);
+    if (bits == 0)
+        return false;
+    st->errorFlags |= DPX_ERR_LEFTOVER;
+    st->bitCursor += static_cast<uint32_t>(bits);
+    st->remainingBits -= static_cast<uint32_t>(bits);
+    return true;
+}
+
+// The element loop: sweeps over the rows; after N consecutive misses the
+// element at the cursor is stepped over when it is whole.  Ends when the
+// window is used up, at a malformed or overrunning element no row names,
+// or after a sweep without progress.
 template <Pass P>
 int loop(DecodeState *st, ElementContext *ctx, Request<P> *rq, const MemberTable &t) {
     const uint32_t n = t.count;
@@ -60,6 +76,11 @@ int loop(DecodeState *st, ElementContext *ctx, Request<P> *rq, const MemberTable
             st->occurrenceCounter = 0;
             if (!decodeMember<P>(st, ctx, rq, m, m.tagBits == 16 ? 16 : 8))
                 return 0;
+            st->occurrenceCounter = 0;
+        }
+        if (st->occurrenceCounter >= n && ctx->present != 0) {
+            if (!stepOverUnknown(st))
+                break;
             st->occurrenceCounter = 0;
         }
     }

@@ -10,12 +10,14 @@ enum : uint32_t {
     kAcIdClass = 0x00, // cap arc of the CAP phase 1/2 contexts
     kCap3Class = 0x14,
     kCap3OeClass = 0x15,
+    kCap4Class = 0x16,   // the CAP v4 gsmSRF context, read as cap3's
+    kCap4OeClass = 0x17, // the other CAP v4 contexts, read as cap3OE's
 };
 
-// The ac and Context arcs after a cap3 / cap3OE class: an ac arc of 03 must
-// follow, else the identifier is flagged and ends.
+// The ac and Context arcs after a cap3 / cap3OE / CAP v4 class: an ac arc
+// of 03 must follow, else the identifier is flagged and ends.
 template <Pass P, uint32_t AcId, uint32_t ContextId>
-int decodeCap3Arcs(DecodeState *st, ElementContext *ctx, const char *name, Request<P> *rq) {
+int decodeContextArcs(DecodeState *st, ElementContext *ctx, const char *name, Request<P> *rq) {
     if (!mandatoryTag<P>(st, rq, 0x03))
         return 1;
     return octetFieldsElement<P, AcId, ContextId>(st, ctx, rq, name);
@@ -41,10 +43,12 @@ int decodeAcObjectIdentifier(DecodeState *st, ElementContext *ctx, Request<P> *r
             ok = octetFields<P, 3799, 3800>(st, ctx, rq);
             break;
         case kCap3Class:
-            ok = decodeCap3Arcs<P, 3877, 3878>(st, ctx, "CAP3", rq);
+        case kCap4Class:
+            ok = decodeContextArcs<P, 3877, 3878>(st, ctx, "CAP3", rq);
             break;
         case kCap3OeClass:
-            ok = decodeCap3Arcs<P, 3879, 3880>(st, ctx, "CAP3OE", rq);
+        case kCap4OeClass:
+            ok = decodeContextArcs<P, 3879, 3880>(st, ctx, "CAP3OE", rq);
             break;
         default: // any other class ends the identifier after the cap arc
             break;

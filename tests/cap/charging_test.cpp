@@ -75,7 +75,11 @@ TEST(Charging, ArgumentsFieldByField) {
           "Choice=Compound Gap Criteria Tag", "  LENGTH=4 octet(s)", "Basic Gap Criteria Tag=a0",
           "  LENGTH=2 octet(s)", "Choice="},
          DPX_ERR_LEFTOVER},
-        {"Specialized Resource Report, unknown identifier", 49, "9F 34 00", {}, DPX_ERR_LEFTOVER},
+        // The choice field takes two octets: the plain NULL of the earlier
+        // phases is shown whole with no name.
+        {"Specialized Resource Report, phase 2 and 3 NULL", 49, "05 00", {"SpecializedResourceReportArg Choice="}, 0},
+        {"Specialized Resource Report, unknown identifier", 49, "9F 34 00", {"SpecializedResourceReportArg Choice="},
+         DPX_ERR_LEFTOVER},
         {"Apply Charging Report without its wrapper", 36, "30 02 A0 00", {}, DPX_ERR_MANDATORY_MISSING | DPX_ERR_LEFTOVER},
     };
     for (const auto &c : cases) {

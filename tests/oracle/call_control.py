@@ -811,6 +811,9 @@ RULE_TEXT = {
     'stop-time-octets': 'call stop time shows its octets as on the wire, the year as one '
                         '16-bit read, low octet first (tshark: swapped BCD date and time)',
     'invoke-indefinite': 'TCAP: an indefinite Invoke\'s end-of-contents is not read (flag 0x10)',
+    'external-indefinite': 'TCAP: an indefinite EXTERNAL in a definite dialogue portion is '
+                           'read in definite mode: its end-of-contents is left in the dialogue '
+                           'portion\'s window (flag 0x10)',
     'tshark-shows-octet-garbled': 'not our rule: tshark shows the calling party\'s category '
                                   'through a mis-sized integer; the octet is compared',
     'opcode-56-not-decoded-by-tshark': 'operation 56 (Continue With Argument, old code): '
@@ -897,8 +900,7 @@ PASSES = ('md', 'display', 'view', 'keys')
 # Rules of ours that leave bits of a valid message unread, and the error
 # flags they raise: TCAP-level ones (the dialogue portion's, and the
 # end-of-contents of an indefinite Invoke) and one inside an argument.
-FLAGGING_RULES = {'acn-partial': 0x10, 'result-after-partial-acn': 0x10,
-                  'asn1-indefinite': 0x12, 'pdu-indefinite': 0x10, 'invoke-indefinite': 0x10,
+FLAGGING_RULES = {'asn1-indefinite': 0x12, 'pdu-indefinite': 0x10, 'invoke-indefinite': 0x10,
                   'component-indefinite': 0x10, 'external-indefinite': 0x10}
 FLAGGING_ARGUMENT_RULES = {}
 
@@ -964,12 +966,24 @@ def _ranges(octets):
 # --------------------------------------------------------------------------
 # Driver
 # --------------------------------------------------------------------------
+def tcap_payload_rules(root, comp):
+    """Rules of the TCAP levels around the component comp that leave an
+    end-of-contents of a valid message unread."""
+    notes = set()
+    if comp.indef:
+        notes.add('invoke-indefinite' if comp.tag == 0xA1 else 'component-indefinite')
+    dlg = root.kid(0x6B)
+    if dlg is not None and not dlg.indef and dlg.kids and dlg.kids[0].indef:
+        notes.add('external-indefinite')
+    return notes
+
+
 def argument_payload(root, stats, hexmsg):
     """(first, end, rule names) of the Invoke's argument, or None."""
     rng = argument_range(root)
     if rng is None:
         return None
-    return rng[0], rng[1], {'invoke-indefinite'} if root.kid(0x6C).kids[0].indef else set()
+    return rng[0], rng[1], tcap_payload_rules(root, root.kid(0x6C).kids[0])
 
 
 def check(corpus, pdml, oracle, ours, parse_node, tcap_rules, payload=argument_payload,

@@ -172,6 +172,8 @@ PROMPT_AND_COLLECT = some((
     (.3, '9F33', boolean),
 ))
 SPECIALIZED_RESOURCE_REPORT = choice(((1, '9F32', null), (1, '9F33', null)))
+# Phases 2 and 3 send a plain NULL instead, in their own SRF dialogues.
+PLAIN_NULL = bytes.fromhex('0500')
 PLAY_TONE = some((
     (1, 'A0', choice(((1, '80', integer(1, 127)), (2, 'A1', leg(None))))),
     (1, 'A1', BURST), (.1, 'A2', extensions),
@@ -280,9 +282,12 @@ def build_corpus(per_op, seed):
             indef = _indef(i, rng)
             content = build(rng)
             arg = content if outer is None else c.tlv(bytes.fromhex(outer), content)
+            phase = 4
+            if code == 49 and i % 3 == 0:
+                arg, phase = PLAIN_NULL, 2 + i // 3 % 2
             comp = c.invoke(rng.randint(-128, 127), code, arg, indef=indef)
             out.append(('op %d/%s' % (code, 'indefinite' if indef else 'definite'),
-                        _wrap(rng, comp, c.default_acn(name, 4), indef,
+                        _wrap(rng, comp, c.default_acn(name, phase), indef,
                               everywhere)))
     for code, build in sorted(RESULTS.items()):
         rng = random.Random(seed * 1000 + 300 + code)
@@ -478,14 +483,11 @@ RULE_TEXT = dict(cc.RULE_TEXT, **{
                                '(flag 0x10)',
     'component-indefinite': 'TCAP: an indefinite Return Result or Return Error\'s '
                             'end-of-contents is not read (flag 0x10)',
-    'external-indefinite': 'TCAP: an indefinite EXTERNAL in a definite dialogue portion is '
-                           'read in definite mode: its end-of-contents is left in the dialogue '
-                           'portion\'s window (flag 0x10)',
     'free-format-data-52-octets': 'free format data shows at most 52 octets; the rest of a '
                                   'longer one (CAP v3/v4: up to 160) is left over (flag 0x10)',
     'call-attempt-result-three-members': 'Initiate Call Attempt result: a loop of three members '
                                          '(phases, functionalities, extensions); '
-                                         'releaseCallArgExtensionAllowed [3] is left over '
+                                         'releaseCallArgExtensionAllowed [3] is stepped over '
                                          '(flag 0x10)',
     'result-sequence-indefinite': 'indefinite result SEQUENCE: one end-of-contents check '
                                   'before the operation code, none after the result, so its '
@@ -511,12 +513,7 @@ def payload(root, stats, hexmsg):
     first = 2 if comp.tag == 0xA1 else 1
     if comp.tag not in (0xA1, 0xA2, 0xA3) or len(comp.kids) <= first:
         return None
-    notes = set()
-    if comp.indef:
-        notes.add('invoke-indefinite' if comp.tag == 0xA1 else 'component-indefinite')
-    dlg = root.kid(0x6B)
-    if dlg is not None and not dlg.indef and dlg.kids and dlg.kids[0].indef:
-        notes.add('external-indefinite')
+    notes = cc.tcap_payload_rules(root, comp)
     if comp.tag == 0xA2:
         result = comp.kids[1]
         if result.indef:

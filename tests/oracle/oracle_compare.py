@@ -21,11 +21,12 @@ It also decodes malformed variants (capgen mutate) with all four passes and
 checks that every pass returns 1, that every reported bit span lies inside
 the message and that the decoder does not crash.
 
-The call-control arguments (call_control.py beside this script) and the
+The call-control arguments (call_control.py beside this script), the
 charging, call gap and announcement arguments, results and errors
-(charging.py) are checked value by value against tshark on messages with
-random values, and every octet of each argument, result or error must lie
-in a reported field of a clean four-pass decode.
+(charging.py) and the SMS arguments (sms.py) are checked value by value
+against tshark on messages with random values, and every octet of each
+argument, result or error must lie in a reported field of a clean
+four-pass decode.
 
 Exit status: 0 all agree, 1 disagreements or a crash, 77 skipped (the
 reference tools or tshark are missing).  Python 3 standard library only.
@@ -101,10 +102,6 @@ RULE_TEXT = {
     'asn1-indefinite': 'indefinite [0] single-ASN.1-type wrapper: no dialogue PDU decoded',
     'pdu-indefinite': 'indefinite AARQ/AARE/ABRT: PDU identifier only, no members '
                       '(ACN, result, abort source)',
-    'acn-partial': 'ACN with a CAP octet other than 0/0x14/0x15 (CAP v4): arcs read '
-                   'down to the CAP octet only',
-    'result-after-partial-acn': 'AARE after a partly read ACN: result not decoded '
-                                '(the ACN\'s last arcs are read as the next identifier)',
     'cp-indefinite-kinds': 'indefinite component portion: at most one component of '
                            'each kind, in the order Invoke, ReturnResult, ReturnError, Reject',
     'component-indefinite-ends-list': 'indefinite-length component: the list ends after it',
@@ -315,7 +312,7 @@ def expect(data, root, ora, notes):
         if dlg.indef and cp is not None:
             notes.add('dialogue-indefinite')
             components_reachable = False
-        dialogue_expectations(data, dlg, tc, uni, e, notes)
+        dialogue_expectations(dlg, tc, uni, e, notes)
 
     if cp is not None and components_reachable:
         component_expectations(cp, ora.get('components') or [], e, notes)
@@ -324,7 +321,7 @@ def expect(data, root, ora, notes):
     return e
 
 
-def dialogue_expectations(data, dlg, tc, uni, e, notes):
+def dialogue_expectations(dlg, tc, uni, e, notes):
     ext = dlg.kid(0x28)
     asn1 = ext.kid(0xA0) if ext is not None else None
     if asn1 is None:
@@ -337,22 +334,9 @@ def dialogue_expectations(data, dlg, tc, uni, e, notes):
     if pdu.indef and not uni:
         notes.add('pdu-indefinite')
         return
-    acn = pdu.kid(0xA1)
-    complete = True
-    if acn is not None:
-        oid = acn.kids[0].content(data)
-        cap = oid[4]
-        complete = (cap == 0 and len(oid) >= 7) or (cap in (0x14, 0x15) and oid[5] == 3)
-        if complete:
-            e['acn'] = tc.get('acn')
-        else:
-            notes.add('acn-partial')
-            e['acn'] = '.'.join((tc.get('acn') or '').split('.')[:6])
+    e['acn'] = tc.get('acn')
     if pdu.tag == 0x61:
-        if complete:
-            e['result'] = tc.get('result')
-        else:
-            notes.add('result-after-partial-acn')
+        e['result'] = tc.get('result')
     e['abort_source'] = tc.get('abort_source')
 
 
@@ -606,8 +590,8 @@ def main(argv=None):
     ap.add_argument('--mutations', type=int, default=2000,
                     help='malformed messages decoded with all passes (default 2000)')
     ap.add_argument('--per-op', type=int, default=200,
-                    help='messages per call-control or charging operation, result operation '
-                         'code and error code (default 200)')
+                    help='messages per call-control, charging or SMS operation, result '
+                         'operation code and error code (default 200)')
     ap.add_argument('--seed', type=int, default=29078)
     ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
     ap.add_argument('--keep', help='keep the generated and decoded files in this folder')
@@ -630,6 +614,7 @@ def main(argv=None):
     sys.path.insert(0, str(here))
     import call_control  # noqa: E402
     import charging  # noqa: E402
+    import sms  # noqa: E402
 
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
@@ -637,7 +622,8 @@ def main(argv=None):
     # The argument suites: (name, module, corpus); each module builds its
     # corpus, checks tshark's and our outputs and reports.
     suites = [(name, module, module.build_corpus(args.per_op, args.seed))
-              for name, module in (('call control', call_control), ('charging', charging))]
+              for name, module in (('call control', call_control), ('charging', charging),
+                                   ('sms', sms))]
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)

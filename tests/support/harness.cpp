@@ -1,5 +1,6 @@
 #include "support/harness.h"
 
+#include "engine/members.h"
 #include "fields/field_table.h"
 
 #include "../../tools/dpx-decode/key_layout.h"
@@ -129,9 +130,42 @@ struct PreRequest {
     PreRequest &operator=(const PreRequest &) = delete;
 };
 
-} // namespace
+// The passes as a host runs them, through the entry points.
+struct EntryPoints {
+    int md(PreDecodeRequest *rq) const { return dpx_PreDecodeMD(rq); }
+    int display(PreDecodeRequest *rq) const { return dpx_PreDecodeTO(rq); }
+    int view(PreDecodeRequest *rq) const { return dpx_PreDecodeMV(rq); }
+    int keys(KeyFieldRequest *rq) const { return KFE_3gpp_camel_400(rq); }
+};
 
-KeyRun runKeys(const Bytes &message, uint16_t room) {
+// A member table walked in each pass, inside a window of `windowBits` bits
+// from the message's start when it is not 0.
+struct TableWalk {
+    const MemberTable &table;
+    uint32_t windowBits;
+    template <Pass P>
+    int run(Request<P> *rq) const {
+        DecodeState *st = rq->state;
+        g_scratch<P> = Scratch{};
+        if (windowBits != 0) {
+            st->remainingBits = windowBits;
+            if (!pushEnd(st))
+                return 0;
+        }
+        ElementContext ctx{0, 1, 0, 0};
+        const int result = walkTable<P>(st, &ctx, rq, table);
+        if (result == 1) // as an entry point hands them back
+            rq->remainingBits = st->remainingBits;
+        return result;
+    }
+    int md(PreDecodeRequest *rq) const { return run<Pass::Decoded>(rq); }
+    int display(PreDecodeRequest *rq) const { return run<Pass::Display>(rq); }
+    int view(PreDecodeRequest *rq) const { return run<Pass::MessageView>(rq); }
+    int keys(KeyFieldRequest *rq) const { return run<Pass::KeyField>(rq); }
+};
+
+template <class Passes>
+KeyRun runKeysWith(const Bytes &message, uint16_t room, const Passes &passes) {
     State s(message);
     KeyRun run{0, {}, Bytes(kKeyBufferSize, 0), 0, {}};
     KeyFieldRequest rq{};
@@ -139,20 +173,23 @@ KeyRun runKeys(const Bytes &message, uint16_t room) {
     rq.dataOffset = HOST_KEY_DATA_START;
     rq.valueRoom = room;
     rq.state = s.st;
-    run.result = KFE_3gpp_camel_400(&rq);
+    run.result = passes.keys(&rq);
     run.end = endOf(run.result, s.st);
     run.dataOffset = rq.dataOffset;
     run.entries = readKeys(run.buffer);
     return run;
 }
 
-Decoded decode(const Bytes &message) {
+// All four passes, each on a freshly prepared state, and the cross-pass
+// invariant.
+template <class Passes>
+Decoded decodeWith(const Bytes &message, const Passes &passes) {
     Decoded d;
     host_ClearRecords();
     {
         State s(message);
         PreRequest r(s.st);
-        d.md = endOf(dpx_PreDecodeMD(&r.rq), s.st);
+        d.md = endOf(passes.md(&r.rq), s.st);
         d.layer = r.rq.layerEntries[0];
         EXPECT_EQ(r.rq.remainingBits, s.st->remainingBits);
         for (uint32_t i = 0; i < host_DecodedCount(); ++i) {
@@ -170,7 +207,7 @@ Decoded decode(const Bytes &message) {
     {
         State s(message);
         PreRequest r(s.st);
-        d.display = endOf(dpx_PreDecodeTO(&r.rq), s.st);
+        d.display = endOf(passes.display(&r.rq), s.st);
         for (uint32_t i = 0; i < host_DisplayCount(); ++i)
             d.shown.push_back({host_Display(i)->displayId, host_Display(i)->text});
     }
@@ -178,12 +215,12 @@ Decoded decode(const Bytes &message) {
     {
         State s(message);
         PreRequest r(s.st);
-        d.view = endOf(dpx_PreDecodeMV(&r.rq), s.st);
+        d.view = endOf(passes.view(&r.rq), s.st);
         d.status = r.rq.status;
         EXPECT_EQ(r.rq.layerIndex, 0u) << "the message-view pass fills no layer entry";
     }
     {
-        KeyRun k = runKeys(message, static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START));
+        KeyRun k = runKeysWith(message, static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START), passes);
         d.keyEntries = std::move(k.entries);
         d.keys = k.end;
     }
@@ -218,6 +255,16 @@ Decoded decode(const Bytes &message) {
     return d;
 }
 
+} // namespace
+
+KeyRun runKeys(const Bytes &message, uint16_t room) { return runKeysWith(message, room, EntryPoints{}); }
+
+Decoded decode(const Bytes &message) { return decodeWith(message, EntryPoints{}); }
+
+Decoded walk(const Bytes &message, const MemberTable &table, uint32_t windowBits) {
+    return decodeWith(message, TableWalk{table, windowBits});
+}
+
 namespace {
 
 // Shrinks a prepared state's growable arrays to one entry each, as a host
@@ -244,7 +291,8 @@ enum class Which { MD, TO, MV, KF };
 
 // Runs one pass with pu_Realloc failing at call n; returns whether the
 // failure was reached.
-bool runFailing(const Bytes &message, Which which, uint32_t n) {
+template <class Passes>
+bool runFailing(const Bytes &message, const Passes &passes, Which which, uint32_t n) {
     State s(message);
     shrinkArrays(s.st);
     PreRequest r(s.st);
@@ -257,10 +305,10 @@ bool runFailing(const Bytes &message, Which which, uint32_t n) {
     host_SetReallocFailAt(n);
     int result = 0;
     switch (which) {
-    case Which::MD: result = dpx_PreDecodeMD(&r.rq); break;
-    case Which::TO: result = dpx_PreDecodeTO(&r.rq); break;
-    case Which::MV: result = dpx_PreDecodeMV(&r.rq); break;
-    case Which::KF: result = KFE_3gpp_camel_400(&kr); break;
+    case Which::MD: result = passes.md(&r.rq); break;
+    case Which::TO: result = passes.display(&r.rq); break;
+    case Which::MV: result = passes.view(&r.rq); break;
+    case Which::KF: result = passes.keys(&kr); break;
     }
     const bool reached = host_ReallocCalls() >= n;
     host_SetReallocFailAt(0);
@@ -282,18 +330,25 @@ bool runFailing(const Bytes &message, Which which, uint32_t n) {
     return reached;
 }
 
-} // namespace
-
-uint32_t checkReallocFailures(const Bytes &message) {
+template <class Passes>
+uint32_t checkReallocFailuresWith(const Bytes &message, const Passes &passes) {
     uint32_t points = 0;
     for (Which w : {Which::MD, Which::TO, Which::MV, Which::KF}) {
         for (uint32_t n = 1;; ++n) {
-            if (!runFailing(message, w, n))
+            if (!runFailing(message, passes, w, n))
                 break;
             ++points;
         }
     }
     return points;
+}
+
+} // namespace
+
+uint32_t checkReallocFailures(const Bytes &message) { return checkReallocFailuresWith(message, EntryPoints{}); }
+
+uint32_t checkReallocFailures(const Bytes &message, const MemberTable &table) {
+    return checkReallocFailuresWith(message, TableWalk{table, 0});
 }
 
 Bytes tlv(uint8_t tag, const Bytes &content) {

@@ -10,6 +10,10 @@
 #include "dpx_camel.h"
 #include "dpx_standin_host.h"
 
+namespace camel {
+struct MemberTable;
+}
+
 namespace camel::test {
 
 using Bytes = std::vector<uint8_t>;
@@ -79,6 +83,13 @@ struct Decoded {
 Decoded decode(const Bytes &message);
 inline Decoded decode(std::string_view hex) { return decode(hexBytes(hex)); }
 
+// Runs all four passes like decode(), but each pass walks the member table
+// `table` from the message's first octet (with the scratch values reset, as
+// an entry point resets them) instead of decoding a TCAP message; with
+// `windowBits` not 0 the walk runs inside a window of that many bits.  Lets
+// a type unit be tested before any argument carries it.
+Decoded walk(const Bytes &message, const MemberTable &table, uint32_t windowBits = 0);
+
 // Runs the key-field pass only, with a given key room; the key buffer is
 // returned so a test can look at the raw bytes.
 struct KeyRun {
@@ -96,6 +107,8 @@ KeyRun runKeys(const Bytes &message, uint16_t room);
 // array that failed, writes no layer entry end and does not advance the
 // layer index.  Returns the number of failure points exercised.
 uint32_t checkReallocFailures(const Bytes &message);
+// The same for a member table walked as walk() walks it.
+uint32_t checkReallocFailures(const Bytes &message, const MemberTable &table);
 
 // The decoded-field texts of a message joined by newlines.
 std::string textDump(const Decoded &d);

@@ -66,8 +66,14 @@ TEST(DialoguePdu, ApplicationContextNames) {
         // Not 03 after cap3OE: flagged, nothing more read; the two arcs
         // left over are skipped at the end of the PDU.
         {"04 00 00 01 15 04 04", {"  cap=cap3OE"}, DPX_ERR_MANDATORY_MISSING | DPX_ERR_LEFTOVER},
+        // The CAP v4 classes (no name of their own) read as cap3's and
+        // cap3OE's; a context value without a name shows empty.
+        {"04 00 00 01 16 03 0e", {"  cap=", "  ac=3", "Context=gsmSRF gsmSCF"}, 0},
+        {"04 00 00 01 17 03 04", {"  cap=", "  ac=3", "Context=CAP gsmSSF scfGenericAC"}, 0},
+        {"04 00 00 01 17 03 08", {"  cap=", "  ac=3", "Context="}, 0},
+        {"04 00 00 01 17 04 04", {"  cap="}, DPX_ERR_MANDATORY_MISSING | DPX_ERR_LEFTOVER},
         // An unknown class ends the identifier after the cap arc.
-        {"04 00 00 01 17 03 04", {"  cap="}, DPX_ERR_LEFTOVER},
+        {"04 00 00 01 18 03 04", {"  cap="}, DPX_ERR_LEFTOVER},
     };
     for (const Case &c : cases) {
         SCOPED_TRACE(c.arcs);
@@ -79,6 +85,46 @@ TEST(DialoguePdu, ApplicationContextNames) {
     ASSERT_NE(oe.find(3880), nullptr);
     EXPECT_EQ(oe.find(3879)->text, "  ac=3");
     EXPECT_EQ(oe.find(3877), nullptr);
+    const auto srf4 = decode(begin(structured(tlv(0x60, acn("04 00 00 01 16 03 0e")))));
+    EXPECT_NE(srf4.find(3878), nullptr);
+    EXPECT_EQ(srf4.find(3879), nullptr);
+}
+
+// Whole CAP v4 messages as the message builder makes them: an Initial DP
+// opening a dialogue (0.4.0.0.1.23.3.4) and a Specialized Resource Report
+// in the answer of an SRF dialogue (0.4.0.0.1.22.3.14), whose result
+// follows the context.
+TEST(DialoguePdu, CapV4DialoguesDecodeWithoutFlags) {
+    const struct {
+        const char *hex;
+        Texts context;
+        std::vector<std::pair<uint32_t, std::string>> shown;
+    } cases[] = {
+        {"6281824804010203046B1E281C060700118605010101A011600F80020780A1090607040000011703046C5AA158020101"
+         "0201003050800473CF256D8208041077982378297183078413120869970285010F9C01029F320864004007716418F4BF"
+         "340B020201D6810591949161419F36016D9F38069121130077829F39080242119001509100",
+         {"  cap=", "  ac=3", "Context=CAP gsmSSF scfGenericAC"},
+         {{1066, "Operation ID(Invoke)=Initial DP"}, {2133, "Call Reference Number Tag=369f"}}},
+        {"654548040102030449040A0B0C0D6B2A2828060700118605010101A01D611B80020780A10906070400000116030EA203"
+         "020100A305A1030201006C0BA1090201010201319F3200",
+         {"  cap=", "  ac=3", "Context=gsmSRF gsmSCF"},
+         {{3774, "  Result=Accepted"}, {1238, "SpecializedResourceReportArg Choice=allAnnouncementsComplete"}}},
+    };
+    for (const auto &c : cases) {
+        const auto d = decode(hexBytes(c.hex));
+        SCOPED_TRACE(textDump(d));
+        Texts context = textsFrom(d, 3797);
+        context.resize(3);
+        EXPECT_EQ(context, c.context);
+        for (const auto &[id, text] : c.shown) {
+            const Field *f = d.find(id);
+            ASSERT_NE(f, nullptr) << id;
+            EXPECT_EQ(f->text, text);
+        }
+        EXPECT_EQ(d.md.errorFlags, 0u);
+        EXPECT_EQ(d.status, 0);
+        EXPECT_EQ(d.md.remainingBits, 0u);
+    }
 }
 
 TEST(DialoguePdu, ResponseResultAndDiagnostic) {
