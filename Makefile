@@ -8,7 +8,9 @@
 #                DP in the readable view, statistics over every sample
 #   make install build and install dpx-decode, the module and the host
 #                libraries under PREFIX (default /usr/local)
-#   make test    deps, then build and test the native, asan and m32 presets
+#   make test    deps, then build and test the native, asan and m32 presets,
+#                then build the fuzz preset and run each fuzz target briefly
+#                over its seeds (test-fuzz)
 #   make bench   build, then run the benchmarks
 #   make bench-capture   build, then dpx-decode against tshark on a capture
 #   make clean   remove build/
@@ -17,9 +19,12 @@ SHELL := /bin/bash
 .DEFAULT_GOAL := build
 
 PRESETS := native asan m32
+# clang and its libFuzzer runtime serve the fuzz preset only (make fuzz,
+# make fuzz-capture and the fuzz smoke run of make test).
+FUZZ_PACKAGES := clang libclang-rt-14-dev
 DEB_PACKAGES := cmake ninja-build g++ g++-multilib googletest libgtest-dev \
                 libbenchmark-dev nlohmann-json3-dev libcli11-dev zlib1g-dev libzstd-dev liblz4-dev tshark \
-                python3
+                python3 $(FUZZ_PACKAGES)
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 APT_INSTALL := $(SUDO) apt-get update -qq; \
                $(SUDO) env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends
@@ -39,7 +44,7 @@ DEMO_CAPTURE := samples/callflow-m3ua.pcap
 DECODE := build/native/dpx-decode
 PREFIX ?= /usr/local
 
-.PHONY: deps build demo install test bench clean $(addprefix test-,$(PRESETS))
+.PHONY: deps build demo install test test-fuzz bench clean $(addprefix test-,$(PRESETS))
 
 deps:
 	@missing=""; \
@@ -101,7 +106,8 @@ test: deps
 	        && ctest --preset "$$preset" \
 	        || { echo "make test: $$preset FAILED" >&2; exit 1; }; \
 	done; \
-	echo "make test: $(PRESETS) passed$${m32:+ (m32 programs run $$m32)}"
+	$(MAKE) --no-print-directory test-fuzz || { echo "make test: fuzz FAILED" >&2; exit 1; }; \
+	echo "make test: $(PRESETS) and fuzz passed$${m32:+ (m32 programs run $$m32)}"
 
 $(addprefix test-,$(PRESETS)): test-%:
 	@if [ $* = m32 ]; then $(M32_CHECK); echo "m32 programs run $$m32"; fi
@@ -125,13 +131,15 @@ clean:
 	rm -rf build
 
 # ---- fuzzing -------------------------------------------------------------------
-# make fuzz: the project's packages plus clang and libFuzzer (FUZZ_PACKAGES,
-# installed here only), then the fuzz preset (build/fuzz) and camel_fuzz for
-# FUZZ_TIME seconds over build/fuzz/corpus (new inputs), build/fuzz/seeds
-# (samples/*.txt) and fuzz/corpus.  Crash inputs land in build/fuzz/.
-FUZZ_PACKAGES := clang libclang-rt-14-dev
+# make fuzz: the fuzz preset (build/fuzz: clang, libFuzzer, ASan+UBSan), then
+# camel_fuzz for FUZZ_TIME seconds over build/fuzz/corpus (new inputs),
+# build/fuzz/seeds (samples/*.txt) and fuzz/corpus.  Crash inputs land in
+# build/fuzz/.
 FUZZ_TIME ?= 300
 FUZZ_ARGS ?= -max_len=512 -dict=fuzz/camel.dict
+# make test-fuzz (part of make test): each target for FUZZ_SMOKE_TIME seconds,
+# its seeds first, new inputs kept in a scratch directory only.
+FUZZ_SMOKE_TIME ?= 15
 
 .PHONY: fuzz fuzz-capture fuzz-capture-file fuzz-ip-fragments fuzz-tools
 fuzz: fuzz-tools
@@ -141,7 +149,6 @@ fuzz: fuzz-tools
 # make fuzz-capture: capture_fuzz, dpx-decode's frame walker (link layer to
 # TCAP message), over build/fuzz/capture-corpus and seeds from samples/*.pcap.
 fuzz-capture: fuzz-tools
-	mkdir -p build/fuzz/capture-corpus
 	build/fuzz/capture_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
 	    -max_len=4096 build/fuzz/capture-corpus build/fuzz/capture-seeds
 
@@ -158,16 +165,19 @@ fuzz-ip-fragments: fuzz-tools
 	build/fuzz/ip_fragments_fuzz -max_total_time=$(FUZZ_TIME) -artifact_prefix=build/fuzz/ \
 	    -max_len=4096 build/fuzz/ip-fragments-corpus
 
+test-fuzz: fuzz-tools
+	rm -rf build/fuzz/smoke && mkdir -p build/fuzz/smoke/camel build/fuzz/smoke/capture \
+	    build/fuzz/smoke/capture-file build/fuzz/smoke/ip-fragments
+	build/fuzz/camel_fuzz -max_total_time=$(FUZZ_SMOKE_TIME) -artifact_prefix=build/fuzz/ \
+	    -print_final_stats=1 $(FUZZ_ARGS) build/fuzz/smoke/camel build/fuzz/seeds fuzz/corpus
+	build/fuzz/capture_fuzz -max_total_time=$(FUZZ_SMOKE_TIME) -artifact_prefix=build/fuzz/ \
+	    -print_final_stats=1 -max_len=4096 build/fuzz/smoke/capture build/fuzz/capture-seeds
+	build/fuzz/capture_file_fuzz -max_total_time=$(FUZZ_SMOKE_TIME) -artifact_prefix=build/fuzz/ \
+	    -print_final_stats=1 -max_len=16384 build/fuzz/smoke/capture-file samples
+	build/fuzz/ip_fragments_fuzz -max_total_time=$(FUZZ_SMOKE_TIME) -artifact_prefix=build/fuzz/ \
+	    -print_final_stats=1 -max_len=4096 build/fuzz/smoke/ip-fragments
+
 fuzz-tools: deps
-	@missing=""; \
-	for pkg in $(FUZZ_PACKAGES); do \
-	    dpkg -s "$$pkg" 2>/dev/null | grep -q '^Status: install ok installed' \
-	        || missing="$$missing $$pkg"; \
-	done; \
-	if [ -n "$$missing" ]; then \
-	    echo "make fuzz: installing$$missing"; \
-	    $(APT_INSTALL) $$missing; \
-	fi
 	cmake --preset fuzz
 	cmake --build --preset fuzz -j2
-	mkdir -p build/fuzz/corpus
+	mkdir -p build/fuzz/corpus build/fuzz/capture-corpus

@@ -32,6 +32,7 @@
 
 #include "dpx_camel.h"
 #include "dpx_standin_host.h"
+#include "fields/field_table.h"
 
 namespace {
 
@@ -131,6 +132,7 @@ struct Run {
     bool keysComplete = false;
     uint32_t decodedCount = 0, displayCount = 0;
     std::vector<std::string> decodedTexts, displayTexts;
+    std::vector<uint32_t> decodedIds, displayIds;
 };
 
 void checkSpans(const Run &run) {
@@ -210,14 +212,17 @@ void runPreDecode(const Options &opt, const std::vector<uint8_t> &buffer, int wh
             for (uint32_t i = 0; i < run.decodedCount; ++i) {
                 const HostDecodedField *f = host_Decoded(i);
                 run.decodedTexts.emplace_back(f->text);
+                run.decodedIds.push_back(f->fieldId);
             }
             run.md = e;
         } else {
             CHECK(host_DecodedCount() == 0, "display pass reported decoded fields",
                   host_DecodedCount(), 0);
             run.displayCount = host_DisplayCount();
-            for (uint32_t i = 0; i < run.displayCount; ++i)
+            for (uint32_t i = 0; i < run.displayCount; ++i) {
                 run.displayTexts.emplace_back(host_Display(i)->text);
+                run.displayIds.push_back(host_Display(i)->displayId);
+            }
             run.to = e;
         }
     }
@@ -314,10 +319,19 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
     CHECK(run.displayCount == run.decodedCount,
           "display pass reported another number of fields than the decoded-field pass",
           run.displayCount, run.decodedCount);
-    // A display value is the value part of its decoded-field text.
+    // Every field is declared, shown under its label's display id, and its
+    // display value is the value part of its decoded-field text (before the
+    // field's suffix), except where the display pass names values its own way.
     for (size_t i = 0; i < run.decodedTexts.size(); ++i) {
+        const size_t at = camel::fieldIndex(run.decodedIds[i]);
+        CHECK(at < camel::kFieldCount, "reported field id is not declared", i, run.decodedIds[i]);
+        CHECK(run.displayIds[i] == camel::kDisplayIds.id[at], "display id is not the label's",
+              run.decodedIds[i], run.displayIds[i]);
+        const camel::FieldDef &def = camel::kFields[at];
+        if (def.displayNameCount != 0 || run.decodedTexts[i].size() + 1 >= DPX_TEXT_BUFFER_SIZE)
+            continue; // named its own way, or cut to the host's line
         const std::string &text = run.decodedTexts[i];
-        const std::string &value = run.displayTexts[i];
+        const std::string value = run.displayTexts[i] + def.suffix;
         CHECK(text.size() >= value.size() &&
                   text.compare(text.size() - value.size(), value.size(), value) == 0,
               "display value does not end its decoded-field text", i, value.size());

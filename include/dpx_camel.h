@@ -167,6 +167,109 @@ typedef struct KeyValueSlot {
 /* Return status of the table-access entry points on a bad index. */
 #define DPX_TABLE_BAD_INDEX 0xD0410001u
 
+/* ---- Description tables (dp_DLLGetTable / dp_DLLGetPtr) ---------------------
+ * Indexes: 1 interface version text; 2 protocol description record (GetPtr:
+ * the four-word header before it); 4 field catalogue (GetTable), layout
+ * prototype block A (GetPtr); 5 the sample record of block B (GetTable),
+ * block B (GetPtr); 6 value table; 7 value-code list; 8 string table;
+ * 9 display attribute table.  Index 3 is not served.
+ */
+enum {
+    DPX_TABLE_VERSION = 1,
+    DPX_TABLE_DESCRIPTION = 2,
+    DPX_TABLE_CATALOGUE = 4,
+    DPX_TABLE_PROTOTYPE_A = 4,
+    DPX_TABLE_PROTOTYPE_B = 5,
+    DPX_TABLE_VALUES = 6,
+    DPX_TABLE_CODES = 7,
+    DPX_TABLE_STRINGS = 8,
+    DPX_TABLE_ATTRIBUTES = 9
+};
+
+/* The protocol description record: 25 consecutive 32-bit members. */
+typedef struct ProtocolDescription {
+    const char *organisation;   /*  0 */
+    const char *shortName;      /*  4 */
+    const char *longName;       /*  8 */
+    const char *release;        /* 12 */
+    const char *network;        /* 16 */
+    const char *remark;         /* 20 */
+    char *text7;                /* 24 writable, empty at load */
+    const char *fileName;       /* 28 */
+    char *text9;                /* 32 writable, empty at load */
+    const char *generator;      /* 36 */
+    const char *generatorCopy;  /* 40 */
+    const char *selectorValue;  /* 44 */
+    const char *selectorKind;   /* 48 */
+    const char *specification;  /* 52 */
+    char *text15;               /* 56 writable, empty at load */
+    char *text16;               /* 60 writable, empty at load */
+    uint32_t number17;          /* 64 */
+    uint32_t number18;          /* 68 */
+    uint32_t number19;          /* 72 */
+    const char *shortNameCopy;  /* 76 */
+    const char *fileNameCopy;   /* 80 */
+    uint32_t number22;          /* 84 */
+    uint32_t number23;          /* 88 */
+    uint32_t number24;          /* 92 */
+    uint32_t number25;          /* 96 */
+} ProtocolDescription;
+
+/* The four header words and the record right after them. */
+typedef struct ProtocolDescriptionBlock {
+    uint32_t header[4];
+    ProtocolDescription record;
+} ProtocolDescriptionBlock;
+
+/* Bytes of each writable text area of the description record. */
+#define DPX_DESCRIPTION_TEXT_SIZE 256
+
+/* One field catalogue entry: 19 32-bit words. */
+typedef struct CatalogueEntry {
+    uint32_t packed;          /*  0 bits 0-7 storage class, 8-15 display variant,
+                                    16-23 key flag, 24-31 group */
+    uint32_t fieldId;         /*  4 */
+    uint32_t keyNumber;       /*  8 1 to 26 for key fields, else 0 */
+    const char *label;        /* 12 without leading blanks */
+    const char *labelCopy;    /* 16 the same text */
+    uint32_t valueCount;      /* 20 */
+    uint32_t firstValue;      /* 24 value-table index; 0xFFFFFFFF: none */
+    uint32_t width;           /* 28 0xFFFF0000 + bits; 0xFFFFFFFF: variable */
+    uint32_t formatIndex;     /* 32 string-table index of the summary format */
+    uint32_t unused1[6];      /* 36 0xFFFFFFFF */
+    uint32_t attributeOffset; /* 60 byte offset in the attribute table */
+    uint32_t unused2[3];      /* 64 0xFFFFFFFF */
+} CatalogueEntry;
+
+#define DPX_CATALOGUE_CLASS(packed) ((packed) & 0xFFu)
+#define DPX_CATALOGUE_VARIANT(packed) (((packed) >> 8) & 0xFFu)
+#define DPX_CATALOGUE_KEY_FLAG(packed) (((packed) >> 16) & 0xFFu)
+#define DPX_CATALOGUE_GROUP(packed) (((packed) >> 24) & 0xFFu)
+#define DPX_CATALOGUE_END 0xFFFFFFFFu /* packed word of the terminator */
+
+/* One value-table entry. */
+typedef struct ValueEntry {
+    uint32_t kind;        /* 0 1: the value equals the code; 0x10000: any other value */
+    uint32_t codeIndex;   /* 4 index into the value-code list */
+    uint32_t stringIndex; /* 8 index into the string table */
+} ValueEntry;
+
+#define DPX_VALUE_NAMED 1u
+#define DPX_VALUE_OTHERWISE 0x10000u
+
+/* The last text of the string table, and the catalogue terminator's label. */
+#define DPX_FINAL_STRING "$$_FINAL_STRING_$$"
+#define DPX_LAST_FIELD "$_$LAST_FIELD$_$"
+
+/* Display attribute table and layout prototype blocks. */
+#define DPX_ATTRIBUTE_TABLE_SIZE 3996
+typedef struct PrototypeHeader {
+    uint32_t blockType;   /* 0 4: block A, 5: block B */
+    uint32_t blockSize;   /* 4 bytes */
+    uint32_t fixupOffset; /* 8 offset of the (pointer, target) offset pairs */
+    uint32_t recordSize;  /* 12 the sample record's size; it starts at 16 */
+} PrototypeHeader;
+
 /* Entry points exported by the module. */
 uint8_t dpx_PreDecodeMD(PreDecodeRequest *request);
 uint8_t dpx_PreDecodeMV(PreDecodeRequest *request);
@@ -280,6 +383,25 @@ DPX_AT(KeyTableEntry, fieldName, 16);
 DPX_LAYOUT_ASSERT(sizeof(KeyTableEntry) == 32, "KeyTableEntry is 32 bytes");
 DPX_AT(KeyValueSlot, bitLength, 0);
 DPX_AT(KeyValueSlot, dataOffset, 2);
+DPX_AT(ProtocolDescription, text7, 24);
+DPX_AT(ProtocolDescription, specification, 52);
+DPX_AT(ProtocolDescription, number17, 64);
+DPX_AT(ProtocolDescription, shortNameCopy, 76);
+DPX_AT(ProtocolDescription, number25, 96);
+DPX_LAYOUT_ASSERT(sizeof(ProtocolDescription) == 100, "ProtocolDescription is 25 words");
+DPX_AT(ProtocolDescriptionBlock, record, 16);
+DPX_AT(CatalogueEntry, fieldId, 4);
+DPX_AT(CatalogueEntry, keyNumber, 8);
+DPX_AT(CatalogueEntry, label, 12);
+DPX_AT(CatalogueEntry, labelCopy, 16);
+DPX_AT(CatalogueEntry, valueCount, 20);
+DPX_AT(CatalogueEntry, firstValue, 24);
+DPX_AT(CatalogueEntry, width, 28);
+DPX_AT(CatalogueEntry, formatIndex, 32);
+DPX_AT(CatalogueEntry, attributeOffset, 60);
+DPX_LAYOUT_ASSERT(sizeof(CatalogueEntry) == 76, "CatalogueEntry is 76 bytes");
+DPX_LAYOUT_ASSERT(sizeof(ValueEntry) == 12, "ValueEntry is 12 bytes");
+DPX_LAYOUT_ASSERT(sizeof(PrototypeHeader) == 16, "PrototypeHeader is 16 bytes");
 #undef DPX_AT
 #endif
 

@@ -38,7 +38,7 @@ template <uint32_t Id>
 struct LowTwoBits {
     template <Pass P>
     static int run(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-        return fittedBitsField<P>(st, ctx, rq, fx(Id), 0, 2, 8);
+        return fittedBitsField<P>(st, ctx, rq, Field<Id>::index, 0, 2, 8);
     }
 };
 
@@ -244,11 +244,11 @@ template <uint32_t CodeId, uint32_t ReservedId>
 struct ServiceCode {
     template <Pass P>
     static int run(DecodeState *st, ElementContext *ctx, Request<P> *rq) {
-        if (!octetField<P>(st, ctx, rq, fx(CodeId)))
+        if (!octetField<P>(st, ctx, rq, Field<CodeId>::index))
             return 0;
         if (ctx->present == 0 || !room(st, 8))
             return 1;
-        return halfOctetField<P>(st, ctx, rq, fx(ReservedId), 4);
+        return halfOctetField<P>(st, ctx, rq, Field<ReservedId>::index, 4);
     }
 };
 constexpr Member kExtBasicServiceCodeAlternatives[] = {

@@ -30,10 +30,14 @@ struct UnitRef {
     }
 };
 
-#define CAMEL_UNIT_FN_(unit, pass)                                                           \
-    [](DecodeState *st_, ElementContext *ctx_, void *rq_) -> int {                           \
-        return unit<pass>(st_, ctx_, static_cast<::camel::Request<pass> *>(rq_));            \
-    }
+// Calls the pass instance `Unit` of a unit template through UnitRef's
+// common signature.  (A named function rather than a lambda: clang 14 passes
+// null arguments through the invoker of a lambda converted at compile time.)
+template <Pass P, auto Unit>
+int unitThunk(DecodeState *st, ElementContext *ctx, void *rq) {
+    return Unit(st, ctx, static_cast<Request<P> *>(rq));
+}
+#define CAMEL_UNIT_FN_(unit, pass) &::camel::unitThunk<pass, &unit<pass>>
 // A row value decoded by the unit template `unit` (template <Pass P> int
 // unit(DecodeState *, ElementContext *, Request<P> *)).
 #define CAMEL_UNIT(unit)                                                                      \

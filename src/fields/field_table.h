@@ -456,6 +456,15 @@ inline constexpr FieldDef kFields[] = {
     tagField(2008, "Generic Numbers Tag"),
     tagField(1957, "Service Interaction Ind Two Tag"),
     tagField(1939, "Charge Number Tag"),
+    argLength(1941),
+    enumField(1942, "Nature Of Address Ind", names::kChargeNatureOfAddress, 7).indented(),
+    enumField(1943, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
+    enumField(1944, "Numbering Plan Indicator", names::kPrivateNumberingPlan, 3)
+        .indented()
+        .display(names::kSpare7Shown),
+    digitsField(3600, "Address Signal").indented().key(12, KeyForm::Variable),
+    hexField(3601, "Filler", 4),
+    digitsField(3603, "Address Signal").indented().key(12, KeyForm::Variable),
     tagField(1946, "CUG Interlock Tag", 16),
     tagField(1950, "CUG Outgoing Access Tag", 16),
     enumField(1659, "Number Qualifier Indicator", names::kNumberQualifier)
@@ -588,9 +597,6 @@ inline constexpr FieldDef kFields[] = {
     argLength(1160),
     tagField(1612, "Calling Party Number Tag"),
     tagField(1635, "Cg Encountered Tag"),
-    digitsField(3600, "Address Signal").indented().key(12, KeyForm::Variable),
-    hexField(3601, "Filler", 4),
-    digitsField(3603, "Address Signal").indented().key(12, KeyForm::Variable),
     argLength(1613),
     enumField(1617, "Nature Of Address Ind", names::kNatureOfAddress, 7).indented(),
     enumField(1618, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
@@ -600,8 +606,8 @@ inline constexpr FieldDef kFields[] = {
         .indented()
         .display(names::kSpare7Shown),
     enumField(1622, "Ni Ind", names::kNiIndicator, 1).indented(),
-    digitsField(1631, "Calling Party Num").indented().key(15, KeyForm::Variable),
     digitsField(1628, "Calling Party Num").indented().key(15, KeyForm::Variable),
+    digitsField(1631, "Calling Party Num").indented().key(15, KeyForm::Variable),
     hexField(1629, "Filler", 4),
     tagField(1638, "Location Number Tag"),
     tagField(1671, "High Layer Compatibility Tag"),
@@ -623,12 +629,6 @@ inline constexpr FieldDef kFields[] = {
     enumField(1827, "Original Redirection Reasons", names::kOriginalRedirectionReason, 4).indented(),
     unsignedField(1828, "Redirection Counter", 3).indented(),
     enumField(1829, "Redirecting Reason", names::kRedirectingReason, 4).indented(),
-    argLength(1941),
-    enumField(1942, "Nature Of Address Ind", names::kChargeNatureOfAddress, 7).indented(),
-    enumField(1943, "Odd/even Indicator", names::kOddEven, 1).indented().display(names::kOddEvenShown),
-    enumField(1944, "Numbering Plan Indicator", names::kPrivateNumberingPlan, 3)
-        .indented()
-        .display(names::kSpare7Shown),
     argLength(1639),
     enumField(3557, "Nature Of Address Ind", names::kLocationNatureOfAddress, 7)
         .indented()
@@ -804,8 +804,9 @@ inline constexpr FieldDef kFields[] = {
     digitsField(2079, "  MCC"),
     hexField(2080, "NAS Filler Don't Show", 4),
     hexField(2085, "  Filler", 4),
-    digitsField(2086, "MNC").indented(),
+    // The three-digit MNC comes first: every "MNC" is shown under 2083.
     digitsField(2083, "MNC").indented().spanSelector(2),
+    digitsField(2086, "MNC").indented(),
     unsignedField(2087, "Location Area Code", 16).indented(),
     hexField(2088, "Cell Identity", 16).indented(),
     tagField(2137, "Called Party Bcd Number Tag", 16),
@@ -1675,12 +1676,54 @@ inline constexpr FieldDef kFields[] = {
 
 inline constexpr size_t kFieldCount = sizeof(kFields) / sizeof(kFields[0]);
 
+// A field's position in the catalogue, as units and member tables hold it.
+using FieldIndex = uint16_t;
+static_assert(kFieldCount < 0xFFFF, "field positions are 16-bit");
+inline constexpr FieldIndex kNoField = 0xFFFF;
+
+// The derivations below run at compile time over the whole table.  Each is
+// linear in the number of fields (a lookup array by id, a hash over the
+// labels), so that they stay inside the compilers' default constexpr limits
+// however many fields are declared.
+
+namespace detail {
+constexpr uint32_t idLimit() {
+    uint32_t limit = 0;
+    for (const FieldDef &f : kFields)
+        limit = f.id >= limit ? f.id + 1 : limit;
+    return limit;
+}
+} // namespace detail
+
+// One past the largest declared field id.
+inline constexpr uint32_t kIdLimit = detail::idLimit();
+
+// Catalogue position by field id (kNoField for an id not declared), and the
+// first id declared twice (0 when every id is declared once).
+struct IdIndex {
+    FieldIndex at[kIdLimit];
+    uint32_t duplicate;
+};
+constexpr IdIndex computeIdIndex() {
+    IdIndex out{};
+    for (uint32_t id = 0; id < kIdLimit; ++id)
+        out.at[id] = kNoField;
+    for (size_t i = 0; i < kFieldCount; ++i) {
+        FieldIndex &slot = out.at[kFields[i].id];
+        if (slot != kNoField && out.duplicate == 0)
+            out.duplicate = kFields[i].id;
+        slot = static_cast<FieldIndex>(i);
+    }
+    return out;
+}
+inline constexpr IdIndex kIdIndex = computeIdIndex();
+static_assert(kIdIndex.duplicate == 0, "a field id is declared twice (kIdIndex.duplicate names it)");
+
 // Position of a field id in the catalogue; kFieldCount when it is unknown.
 constexpr size_t fieldIndex(uint32_t id) {
-    for (size_t i = 0; i < kFieldCount; ++i)
-        if (kFields[i].id == id)
-            return i;
-    return kFieldCount;
+    if (id >= kIdLimit || kIdIndex.at[id] == kNoField)
+        return kFieldCount;
+    return kIdIndex.at[id];
 }
 
 namespace detail {
@@ -1696,33 +1739,46 @@ constexpr bool sameText(const char *a, const char *b) {
     }
     return *a == *b;
 }
+// FNV-1a of a text.
+constexpr uint32_t textHash(const char *s) {
+    uint32_t h = 2166136261u;
+    for (; *s != '\0'; ++s)
+        h = (h ^ static_cast<uint8_t>(*s)) * 16777619u;
+    return h;
+}
+constexpr size_t labelSlots() {
+    size_t n = 64;
+    while (n < 2 * kFieldCount)
+        n *= 2;
+    return n;
+}
 } // namespace detail
-
-// A field's position in the catalogue, as units and member tables hold it.
-using FieldIndex = uint16_t;
-static_assert(kFieldCount < 0xFFFF, "field positions are 16-bit");
-inline constexpr FieldIndex kNoField = 0xFFFF;
 
 // The display id of every field, by catalogue position: the id of the first
 // catalogue entry whose label equals the field's label with leading blanks
-// ignored.
+// ignored.  One pass in catalogue order over an open-addressing table of the
+// labels met so far: the first field with a label claims its slot.
 struct DisplayIds {
     uint32_t id[kFieldCount];
 };
 constexpr DisplayIds computeDisplayIds() {
+    constexpr size_t kSlots = detail::labelSlots();
+    FieldIndex first[kSlots]{};
+    for (size_t s = 0; s < kSlots; ++s)
+        first[s] = kNoField;
     DisplayIds out{};
     for (size_t i = 0; i < kFieldCount; ++i) {
         const char *label = detail::skipBlanks(kFields[i].label);
-        out.id[i] = kFields[i].id;
         if (kFields[i].shownUnder != 0) {
             out.id[i] = kFields[i].shownUnder;
             continue;
         }
-        for (size_t j = 0; j < i; ++j)
-            if (detail::sameText(detail::skipBlanks(kFields[j].label), label)) {
-                out.id[i] = kFields[j].id;
-                break;
-            }
+        size_t s = detail::textHash(label) & (kSlots - 1);
+        while (first[s] != kNoField && !detail::sameText(detail::skipBlanks(kFields[first[s]].label), label))
+            s = (s + 1) & (kSlots - 1);
+        if (first[s] == kNoField)
+            first[s] = static_cast<FieldIndex>(i);
+        out.id[i] = kFields[first[s]].id;
     }
     return out;
 }
@@ -1748,22 +1804,15 @@ inline void fieldIdNotDeclared() {} // not constexpr: using it stops compilation
 } // namespace detail
 
 // The catalogue position of a declared field id, for tables built at
-// compile time; an undeclared id does not compile.
+// compile time; an undeclared id does not compile.  (Inside a template,
+// where some compilers reject a consteval call on a template parameter,
+// use Field<Id>::index.)
 consteval FieldIndex fx(uint32_t id) {
     const size_t i = fieldIndex(id);
     if (i >= kFieldCount)
         detail::fieldIdNotDeclared();
     return static_cast<FieldIndex>(i);
 }
-
-constexpr bool idsAreUnique() {
-    for (size_t i = 0; i < kFieldCount; ++i)
-        for (size_t j = i + 1; j < kFieldCount; ++j)
-            if (kFields[i].id == kFields[j].id)
-                return false;
-    return true;
-}
-static_assert(idsAreUnique(), "a field id is declared twice");
 
 // The declaration of a field known at compile time.
 template <uint32_t Id>

@@ -131,10 +131,11 @@ TEST(MobileLocationArea, MncFormsAndShortWindows) {
               (std::vector<Span>{{p + 20, p + 23, 5}, {p + 16, p + 19, 1}, {p + 12, p + 15, 1}}));
     EXPECT_EQ(d.find(2083)->selector, 2u);
     EXPECT_EQ(d.find(2087)->spans, (std::vector<Span>{{p + 24, p + 31, 0x12}, {p + 32, p + 39, 0x34}}));
-    // Both MNC forms share one display id, the two-digit form's (met first).
+    // Both MNC forms share one display id, the three-digit form's (first in
+    // the catalogue), as every MNC does.
     const Decoded two = decode(initialDp(tlv("BF 34", tlv("A3", "81 05 32 F4 51 12 34"))));
-    EXPECT_EQ(displayIds(two, 2086), (std::vector<uint32_t>{2086}));
-    EXPECT_EQ(displayIds(d, 2083), (std::vector<uint32_t>{2086}));
+    EXPECT_EQ(displayIds(two, 2086), (std::vector<uint32_t>{2083}));
+    EXPECT_EQ(displayIds(d, 2083), (std::vector<uint32_t>{2083}));
     EXPECT_EQ(d.find(2079)->label, "  MCC");
 }
 

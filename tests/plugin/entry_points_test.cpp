@@ -22,14 +22,25 @@ constexpr uint32_t kBeginBits = 64;
 // ---- Table access and date_conv -------------------------------------------------
 
 TEST(PluginTables, InterfaceVersionAtIndexOneOtherIndexesRefused) {
-    for (auto get : {dp_DLLGetTable, dp_DLLGetPtr}) {
+    const struct {
+        uint32_t (*get)(int32_t, const void **);
+        int32_t last;
+    } entries[] = {{dp_DLLGetTable, 9}, {dp_DLLGetPtr, 5}};
+    for (const auto &e : entries) {
         const void *out = nullptr;
-        EXPECT_EQ(get(1, &out), 0u);
+        EXPECT_EQ(e.get(1, &out), 0u);
         ASSERT_NE(out, nullptr);
         EXPECT_STREQ(static_cast<const char *>(out), "QZ1.02.01");
-        for (int32_t index : {0, -1, 2, 3, 6, INT32_MIN, INT32_MAX}) {
+        for (int32_t index = 2; index <= e.last; ++index) {
+            out = nullptr;
+            if (index != 3) {
+                EXPECT_EQ(e.get(index, &out), 0u) << index;
+                EXPECT_NE(out, nullptr) << index;
+            }
+        }
+        for (int32_t index : {0, -1, 3, e.last + 1, INT32_MIN, INT32_MAX}) {
             out = &kBeginBits;
-            EXPECT_EQ(get(index, &out), DPX_TABLE_BAD_INDEX) << index;
+            EXPECT_EQ(e.get(index, &out), DPX_TABLE_BAD_INDEX) << index;
             EXPECT_EQ(out, nullptr) << index;
         }
     }

@@ -109,7 +109,7 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
     ASSERT_EQ(hex[0], "6206480401020304"); // the first sample in full
     const json &o = objects[0];
     EXPECT_EQ(o["md"]["layer"], json::parse(R"({"first":1,"last":64})"));
-    EXPECT_EQ(o["display"]["fields"][0], json::parse(R"({"displayId":3604,"text":"Begin"})"));
+    EXPECT_EQ(o["display"]["fields"][0], json::parse(R"({"displayId":3604,"text":"Begin","label":"MT"})"));
     EXPECT_EQ(o["keys"]["entries"][1],
               json::parse(
                   R"({"index":26,"name":"Originating Transaction Id","value":"01020304","bits":32,"text":"01020304"})"));

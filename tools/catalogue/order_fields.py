@@ -8,7 +8,7 @@ message builder) makes many messages of every operation with random
 argument values, dpx-decode reports their fields, and the first-occurrence
 order of the fields in each message gives "a before b" edges.  Operations
 are taken in the dispatcher's comparison order; within one operation the
-edges are sorted topologically, ties going to the field seen first.  A
+edges are sorted topologically, ties keeping the declared order.  A
 field no message showed keeps its place before the next declared field one did.
 
     tools/catalogue/order_fields.py --decoder build/native/dpx-decode \
@@ -103,8 +103,11 @@ def order(declared, seqs_by_op):
                     edges[a].add(b)
                     indeg[b] += 1
         while nodes:
+            # Fields no walk orders (alternatives of one choice, elements
+            # of different messages) keep their declared order, so a table
+            # that agrees with every observed edge is left as it is.
             ready = [i for i in nodes if indeg[i] == 0] or list(nodes)  # a cycle: earliest wins
-            pick = min(ready, key=lambda i: first_seen[i])
+            pick = min(ready, key=lambda i: (declared_at.get(i, len(declared_at)), first_seen[i]))
             nodes.discard(pick)
             for b in edges.pop(pick, ()):
                 indeg[b] -= 1
@@ -144,6 +147,7 @@ if __name__ == '__main__':
     end = text.rfind('\n', start, text.rfind('\n', start, end)) + 1  # keep the comment above it
     declared_list = entries(text[start:end])
     declared = dict(declared_list)
+    declared_at = {i: k for k, (i, _) in enumerate(declared_list)}
 
     walk = a.walk or os.path.join(os.path.dirname(a.decoder), 'catalogue-walk')
     static = {}

@@ -26,6 +26,7 @@
 #include "views/ek_output.h"
 #include "views/dialogue_view.h"
 #include "views/flow_svg.h"
+#include "tables.h"
 #include "views/output.h"
 #include "views/srt_stats.h"
 #include "views/summary.h"
@@ -81,6 +82,15 @@ bool parseSsnList(const std::string &text, std::bitset<256> &out) {
         pos = comma + 1;
     }
     return true;
+}
+
+// --tables: the description tables, as a host reads them.
+int printTables(const dpxdecode::Module &module) {
+    if (!dpxdecode::writeTables(std::cout, module)) {
+        std::cerr << "dpx-decode: the module does not serve every description table\n";
+        return kExitNoModule;
+    }
+    return std::cout.flush() ? 0 : kExitBadInput;
 }
 
 } // namespace
@@ -146,6 +156,8 @@ int main(int argc, char **argv) {
                    "seconds of capture time after which a silent dialogue is written out as open (default 60)")
         ->check(CLI::Range(0.001, 1e9));
     app.add_option("--flow", flowFile, "write a call-flow picture (SVG) of the dialogues to this file");
+    bool tables = false;
+    app.add_flag("--tables", tables, "print the module's description tables as one JSON object and exit");
 
     // "--stats srt" names what --stats counts; "--stats FILE" is the flag and a file.
     std::vector<std::string> args(argv + std::min(argc, 1), argv + argc);
@@ -214,6 +226,11 @@ int main(int argc, char **argv) {
                   << (served ? static_cast<const char *>(interfaceVersion) : "(not served)") << '\n';
         return served ? 0 : kExitNoModule;
     }
+
+    if (tables)
+        return printTables(module);
+    if (!dpxdecode::loadCatalogue(module))
+        std::cerr << "dpx-decode: the module serves no field catalogue: labels left empty\n";
 
     std::ios::sync_with_stdio(false);
     static char outBuffer[1 << 16];

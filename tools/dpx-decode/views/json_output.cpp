@@ -6,6 +6,7 @@
 #include "json_writer.h"
 #include "key_text.h"
 #include "output.h"
+#include "tables.h"
 
 namespace dpxdecode {
 namespace {
@@ -43,7 +44,8 @@ void displayJson(Writer &w, const DisplayPassOut &d) {
     w.raw(",").key("fields").raw("[");
     bool first = true;
     for (const DisplayOut &f : d.fields) {
-        w.raw(first ? "{" : ",{").key("displayId").number(f.displayId).raw(",").key("text").string(f.text).raw("}");
+        w.raw(first ? "{" : ",{").key("displayId").number(f.displayId).raw(",").key("text").string(f.text);
+        w.raw(",").key("label").string(catalogueLabel(f.displayId)).raw("}");
         first = false;
     }
     w.raw("]}");
