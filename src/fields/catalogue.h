@@ -55,7 +55,10 @@ constexpr const char *conversion(const FieldDef &f) {
     case Render::Enum:
         return "%-S";
     case Render::Chars:
+    case Render::AccessPointName:
         return "%s";
+    case Render::Dotted:
+        return "%-[\"%u\":\".\"]";
     }
     return "%u";
 }
@@ -71,6 +74,28 @@ constexpr uint32_t storageClass(const FieldDef &f) {
 constexpr uint32_t widthWord(const FieldDef &f) {
     return f.width == 0 ? 0xFFFFFFFFu : 0xFFFF0000u + f.width;
 }
+
+// The host's key numbers: the key fields in the order the host numbers
+// them (1 to 26), which is the order the grammar's walk first meets them.
+inline constexpr uint32_t kKeyFieldOrder[] = {3604, 3705, 1066, 1480, 3589, 3592, 3600, 3603, 1557,
+                                               1628, 1631, 2025, 2029, 2179, 2442, 2446, 2449, 2290,
+                                               2413, 3669, 1068, 3685, 1070, 3653, 3656, 3659};
+
+constexpr uint32_t keyNumberOf(uint32_t id) {
+    for (uint32_t k = 0; k < sizeof kKeyFieldOrder / sizeof kKeyFieldOrder[0]; ++k)
+        if (kKeyFieldOrder[k] == id)
+            return k + 1;
+    return 0;
+}
+
+// Every key field has its number.
+constexpr bool keyFieldsNumbered() {
+    for (size_t i = 0; i < kFieldCount; ++i)
+        if (kFields[i].keyEntry >= 0 && keyNumberOf(kFields[i].id) == 0)
+            return false;
+    return true;
+}
+static_assert(keyFieldsNumbered(), "a key field is missing from kKeyFieldOrder");
 
 // One value entry a field contributes, before indexes are assigned.
 struct ValueSource {
@@ -285,11 +310,11 @@ constexpr Plan buildPlan() {
         return p.codeCount++;
     };
 
-    uint32_t value = 0, key = 0;
+    uint32_t value = 0;
     for (size_t i = 0; i < kFieldCount; ++i) {
         const FieldDef &f = kFields[i];
         p.formatString[i] = stringIndex(formatOf(i));
-        p.keyNumber[i] = f.keyEntry >= 0 ? ++key : 0;
+        p.keyNumber[i] = f.keyEntry >= 0 ? keyNumberOf(f.id) : 0;
         const uint32_t n = valueCountOf(f);
         p.firstValue[i] = n == 0 ? 0xFFFFFFFFu : value;
         for (uint32_t k = 0; k < n; ++k, ++value) {

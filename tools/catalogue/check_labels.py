@@ -22,6 +22,12 @@ import sys
 ROOT = os.path.dirname(os.path.dirname(os.path.dirname(os.path.abspath(__file__))))
 
 
+
+# Display ids a field's declaration states outright instead of the first
+# entry with its label (the time and time zone tag of the GPRS and SMS
+# arguments is shown under the Initial DP's).
+STATED_DISPLAY_IDS = {2231: 2230}
+
 def main():
     ap = argparse.ArgumentParser(description=__doc__.split('\n')[0])
     ap.add_argument('--decoder', required=True)
@@ -72,10 +78,11 @@ def main():
             label = found[0]['label']
             if f['label'].lstrip(' ') != label:
                 problems.append('field %d: reported label %r, catalogue %r' % (f['id'], f['label'], label))
-            if s['displayId'] != first_with_label[label]:
+            stated = STATED_DISPLAY_IDS.get(f['id'])
+            if s['displayId'] != (stated or first_with_label[label]):
                 problems.append('field %d: display id %d, first entry labelled %r is %d'
                                 % (f['id'], s['displayId'], label, first_with_label[label]))
-            if s.get('label') != label:
+            if stated is None and s.get('label') != label:
                 problems.append('display id %d: label %r, catalogue %r' % (s['displayId'], s.get('label'), label))
     if out.returncode not in (0,) and messages == 0:
         print('FAILED: dpx-decode exit status %d: %s' % (out.returncode, out.stderr[:500]))

@@ -19,6 +19,7 @@ already in that order.
 """
 import argparse
 import collections
+import glob
 import json
 import os
 import re
@@ -70,6 +71,25 @@ def field_sequences(decoder, hexes):
                 first.append(i)
         seqs.append(first)
     return seqs
+
+
+def sample_sequences(decoder):
+    """First-occurrence field sequences of the bundled samples' messages that
+    carry one Invoke, by operation code: the samples show elements the
+    generator leaves out (a routing area identity in an SMS Initial DP)."""
+    files = sorted(glob.glob(os.path.join(ROOT, 'samples', '*.txt')))
+    r = subprocess.run([decoder, '--format', 'json', '--pass', 'md'] + files,
+                       capture_output=True, text=True)
+    out = collections.defaultdict(list)
+    for line in r.stdout.splitlines():
+        fields = json.loads(line)['md']['fields']
+        codes = [f['spans'][-1][2] for f in fields if f['id'] == FIRST_ARGUMENT_AFTER and f['spans']]
+        if len(codes) != 1:
+            continue
+        ids = [f['id'] for f in fields]
+        ids = ids[ids.index(FIRST_ARGUMENT_AFTER) + 1:]
+        out[codes[0]].append(list(dict.fromkeys(ids)))
+    return out
 
 
 def entries(segment):
@@ -155,12 +175,13 @@ if __name__ == '__main__':
         code, *ids = map(int, line.split())
         static.setdefault(code, ids)
     ops = capgen_ops(a.tools)
+    samples = sample_sequences(a.decoder)
     seqs_by_op = []
     for code in DISPATCH:
         seqs = [static[code]] if code in static else []
         if code in ops:
             seqs += field_sequences(a.decoder, messages_of(a.tools, ops[code], a.messages))
-        seqs_by_op.append(seqs)
+        seqs_by_op.append(seqs + samples.get(code, []))
     new = order(declared, seqs_by_op)
     if new == [i for i, _ in declared_list]:
         print('field table already in walk order')
