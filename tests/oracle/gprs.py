@@ -124,10 +124,13 @@ EVENT_SPECIFIC_INFORMATION = choice((
                     (.5, 'A3', QOS), (.6, 'A4', LOCATION_INFORMATION_GPRS),
                     (.5, '85', TIME_AND_TIMEZONE), (.5, '86', gsn_address)))),
 ))
-# MS network capability [0] and MS radio access capability [1]: decoded
-# by the MS capability unit, which is not part of these rows.
-GPRS_MS_CLASS = some(((1, '80', lambda rng: octets(rng, 1, 2)),
-                      (.5, '81', lambda rng: octets(rng, 2, 8))))
+# MS network capability (two octets) and radio access capabilities of
+# several access technologies (GSM E then GSM 1800 with A5 and multislot
+# classes; GSM P with the HSCSD class; GSM 1800 then an additional
+# technology list).
+MS_RADIO_ACCESS = ('1433822a9719892800', '0288db0a', '3327466f6f8ba580')
+GPRS_MS_CLASS = some(((1, '80', lambda rng: octets(rng, 2, 2)),
+                      (.5, '81', lambda rng: bytes.fromhex(rng.choice(MS_RADIO_ACCESS)))))
 
 
 def connect_gprs(rng):
@@ -309,14 +312,11 @@ VALUES = (
 )
 
 RULE_TEXT = dict(ch.RULE_TEXT, **{
-    'gprsms-class-not-decoded': 'GPRS Initial DP with a Gprsms Class element (A5): its unit is '
-                                'not among the GPRS rows yet; the element loop steps over it '
-                                '(flag 0x10, its octets in no field)',
     'long-qos-format-not-compared': 'long QoS format: read as the short format\'s three octets '
                                     'then octets 4 to 11; tshark reads MAP\'s Ext-QoS-Subscribed '
                                     '(allocation priority first), so its values are not compared',
 })
-FLAGGING_PAYLOAD_RULES = dict(ch.FLAGGING_PAYLOAD_RULES, **{'gprsms-class-not-decoded': 0x10})
+FLAGGING_PAYLOAD_RULES = ch.FLAGGING_PAYLOAD_RULES
 ROWS = [cc._row(r) for r in VALUES]
 
 
@@ -336,16 +336,8 @@ def payload(root, stats, hexmsg):
     dlg = root.kid(0x6B)
     if dlg is not None and not dlg.indef and dlg.kids and dlg.kids[0].indef:
         notes.add('external-indefinite')
-    if _ms_class(arg):
-        notes.add('gprsms-class-not-decoded')
-        stats.rule('gprsms-class-not-decoded', hexmsg)
     return arg.off, arg.end, notes
 
-
-def _ms_class(arg):
-    """Whether the argument is a GPRS Initial DP (IMSI 83 and time 84 at the
-    top: no other GPRS argument has both) with a Gprsms Class element."""
-    return arg.tag == 0x30 and all(arg.kid(t) is not None for t in (0xA5, 0x83, 0x84))
 
 
 def check(corpus, pdml, oracle, ours, parse_node, tcap_rules):
