@@ -6,10 +6,12 @@ The member tables' rows are walked as they are declared (catalogue-walk);
 what the hand-written units show is observed: capgen.py (the test tooling's
 message builder) makes many messages of every operation with random
 argument values, dpx-decode reports their fields, and the first-occurrence
-order of the fields in each message gives "a before b" edges.  Operations
-are taken in the dispatcher's comparison order; within one operation the
-edges are sorted topologically, ties keeping the declared order.  A
-field no message showed keeps its place before the next declared field one did.
+order of the fields in each message gives "a before b" edges; the bundled
+samples' messages with one Invoke add theirs (they show elements the
+generator leaves out).  Operations are taken in the dispatcher's comparison
+order; within one operation the edges are sorted topologically, ties keeping
+the declared order.  A field no message showed keeps its place before the
+next declared field one did.
 
     tools/catalogue/order_fields.py --decoder build/native/dpx-decode \
         [--tools ../shared/tools] [--messages 60] [--check]
