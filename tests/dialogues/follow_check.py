@@ -116,6 +116,14 @@ class Recorder:
             self.last = kw
             return original(**kw)
         c.arg_initial_dp = idp
+        # An SMS Initial DP gives its dialogue the service key; its addresses
+        # are not the call's called and calling numbers.
+        original_sms = c.arg_initial_dp_sms
+
+        def idp_sms(**kw):
+            self.last = {'service_key': kw.get('service_key')}
+            return original_sms(**kw)
+        c.arg_initial_dp_sms = idp_sms
 
     def make(self, kind, a, b):
         self.last = None
