@@ -258,7 +258,9 @@ template <class S> std::unique_ptr<ByteStream> started(ByteStream &inner, std::s
 
 } // namespace
 
-std::unique_ptr<ByteStream> decompressing(Compression c, ByteStream &inner, std::string &error) {
+// `inner` is unused in a build without any decompression library.
+std::unique_ptr<ByteStream> decompressing(Compression c, [[maybe_unused]] ByteStream &inner,
+                                          std::string &error) {
     switch (c) {
 #if DPX_HAVE_ZLIB
     case Compression::Gzip: return started<GzipStream>(inner, error);
