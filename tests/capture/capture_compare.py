@@ -235,7 +235,16 @@ def write_capture(capwrite, outdir, name, file_opts, lines):
     src = outdir / (name + '.hex')
     src.write_text('\n'.join(lines) + '\n')
     path = outdir / name
-    subprocess.run([capwrite] + file_opts + ['-o', str(path), str(src)], check=True)
+    r = subprocess.run([capwrite] + file_opts + ['-o', str(path), str(src)],
+                       capture_output=True, text=True)
+    if r.returncode != 0 and name.endswith('.gz') and 'not supported' in r.stderr:
+        # A build without zlib (the 32-bit one, typically) neither writes nor
+        # reads compressed captures.
+        print('%s: skipped, %s' % (name, r.stderr.strip()))
+        return None
+    if r.returncode != 0:
+        sys.stderr.write(r.stderr)
+        raise subprocess.CalledProcessError(r.returncode, r.args)
     return path
 
 
@@ -254,7 +263,9 @@ def generate(capwrite, callflow, outdir, total, seed):
                                                        rng.choice(sccp), ssn))
             lines.append('# call %d: %s' % (call, desc))
             lines.append(hexmsg)
-        paths.append(write_capture(capwrite, outdir, name, file_opts, lines))
+        path = write_capture(capwrite, outdir, name, file_opts, lines)
+        if path is not None:
+            paths.append(path)
     # TCAP between the HLR and the VLR, no dialogue portion: nothing CAMEL.
     lines = ['#@ ' + OTHER_SSN]
     for side, hexmsg, desc, call in items[:200]:
