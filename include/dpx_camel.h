@@ -201,7 +201,7 @@ typedef struct ProtocolDescription {
     const char *generatorCopy;  /* 40 */
     const char *selectorValue;  /* 44 */
     const char *selectorKind;   /* 48 */
-    const char *specification;  /* 52 */
+    const char *standard;       /* 52: the 3GPP document decoded */
     char *text15;               /* 56 writable, empty at load */
     char *text16;               /* 60 writable, empty at load */
     uint32_t number17;          /* 64 */
@@ -384,7 +384,7 @@ DPX_LAYOUT_ASSERT(sizeof(KeyTableEntry) == 32, "KeyTableEntry is 32 bytes");
 DPX_AT(KeyValueSlot, bitLength, 0);
 DPX_AT(KeyValueSlot, dataOffset, 2);
 DPX_AT(ProtocolDescription, text7, 24);
-DPX_AT(ProtocolDescription, specification, 52);
+DPX_AT(ProtocolDescription, standard, 52);
 DPX_AT(ProtocolDescription, number17, 64);
 DPX_AT(ProtocolDescription, shortNameCopy, 76);
 DPX_AT(ProtocolDescription, number25, 96);

@@ -46,7 +46,7 @@ nlohmann::ordered_json description(const ProtocolDescription &d) {
                                   text(d.release), text(d.network), text(d.remark), text(d.text7),
                                   text(d.fileName), text(d.text9), text(d.generator),
                                   text(d.generatorCopy), text(d.selectorValue),
-                                  text(d.selectorKind), text(d.specification), text(d.text15),
+                                  text(d.selectorKind), text(d.standard), text(d.text15),
                                   text(d.text16), d.number17, d.number18, d.number19,
                                   text(d.shortNameCopy), text(d.fileNameCopy), d.number22,
                                   d.number23, d.number24, d.number25});
