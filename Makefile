@@ -13,6 +13,9 @@
 #                over its seeds (test-fuzz)
 #   make bench   build, then run the benchmarks
 #   make bench-capture   build, then dpx-decode against tshark on a capture
+#   make mutation  plant the faults of tools/mutation/faults.py one at a
+#                time in a copy of the tree (build/mutation), rebuild, run
+#                the native tests, report which faults the tests catch
 #   make clean   remove build/
 
 SHELL := /bin/bash
@@ -44,7 +47,7 @@ DEMO_CAPTURE := samples/callflow-m3ua.pcap
 DECODE := build/native/dpx-decode
 PREFIX ?= /usr/local
 
-.PHONY: deps build demo install test test-fuzz bench clean $(addprefix test-,$(PRESETS))
+.PHONY: deps build demo install test test-fuzz bench clean mutation $(addprefix test-,$(PRESETS))
 
 deps:
 	@missing=""; \
@@ -126,6 +129,12 @@ BENCH_MESSAGES ?= 100000
 .PHONY: bench-capture
 bench-capture: build
 	python3 bench/capture_bench.py --messages $(BENCH_MESSAGES)
+
+# Not part of make test: one incremental build and test run per fault.
+# MUTATION_ARGS: e.g. --resume, --only ID,ID.
+MUTATION_ARGS ?=
+mutation:
+	python3 tools/mutation/mutate.py --out build/mutation/table.md $(MUTATION_ARGS)
 
 clean:
 	rm -rf build
