@@ -1,7 +1,7 @@
 // Mobile identities, location and time: IMSI digit counts and key, the
-// MCC-MNC forms, time and time zone, location information with every
-// member, and the subscriber state alternatives.  (The values of the other
-// mobile elements are compared with tshark by the reference comparison.)
+// MCC-MNC forms, time and time zone, the order and digit limit of location
+// information.  (The values of the mobile elements are compared with tshark
+// by the reference comparison.)
 #include <gtest/gtest.h>
 
 #include <cstdio>
@@ -162,65 +162,10 @@ TEST(MobileTime, SwappedHalfOctetsAndTimeZone) {
     EXPECT_EQ(d.find(2240)->spans, (std::vector<Span>{{p + 56, p + 62, 8}}));
 }
 
-TEST(MobileLocationInformation, EveryMemberInItsOrder) {
-    const std::string members = "02 02 01 2C "                                   // age 300
-                                "80 08 10 12 34 56 89 AB CD 85 "                 // geographical
-                                "81 04 91 21 43 F5 "                             // VLR number
-                                "82 04 83 14 21 43 "                             // location number
-                                "A3 07 81 05 32 F4 51 12 34 "                    // location area
-                                "A4 0E A0 0A 30 08 06 02 2A 03 A1 02 04 05 A1 00 " // extensions
-                                "85 03 12 34 56 "                                // selected LSA id
-                                "86 03 91 21 F3 "                                // MSC number
-                                "87 02 AB CD "                                   // geodetic
-                                "88 00 ";                                        // current location
-    const Decoded d = decode(initialDp(tlv("BF 34", members)));
-    EXPECT_EQ(textsFrom(d, 2031),
-              (Texts{"Location Information Tag=34bf", "  LENGTH=67 octet(s)",
-                     "  Age Of Location Information=2", "  LENGTH=2 octet(s)",
-                     "  Age Of Location Information=300",
-                     "Geographical Information Tag=80", "  LENGTH=8 octet(s)",
-                     "  Type Of Shape=Ellipsoid Point With Uncertainty Circle", "  Latitude=123456",
-                     "Degrees Of Longitude=89abcd", "Uncertainty Code=5",
-                     "VLR Number=81", "  LENGTH=4 octet(s)",
-                     "  Numbering Plan Ind=ISDN/telephony Number Plan",
-                     "  Nature Of Address=International Number", "  Extension Indicator=No Extension",
-                     "  ISDN Address Digits=12345f",
-                     "  Location Number=82", "  LENGTH=4 octet(s)", "  Odd/even Indicator=Odd",
-                     "  Nature Of Address Indicator=National (significant) Number",
-                     "  Internal Network Number Ind=Routing to Internal Numberallowed",
-                     "  Numbering Plan Indicator=ISDN/telephony (rec. E.164)",
-                     "  Presentation Indicator=Presentation Restricted", "  Screening Indicator=Reserved",
-                     "  Address Signals=1234",
-                     "Cell Id Or Sai Or LAI Tag=a3", "  LENGTH=7 octet(s)", "laiFixedLength Tag=81",
-                     "  LENGTH=5 octet(s)", "  MCC=234", "NAS Filler Don't Show=f", "  Filler=f", "  MNC=51",
-                     "  Location Area Code=4660",
-                     "Extension Container Tag=a4", "  LENGTH=14 octet(s)", "  Private Extension List=a0",
-                     "  LENGTH=10 octet(s)", "  Private Extension=30", "  LENGTH=8 octet(s)", "Ext Id Tag=6",
-                     "  LENGTH=2 octet(s)", "  Extension Id=2a03", "  Ext Type=a1020405",
-                     "  PCS-Extensions=a1", "  LENGTH=0 octet(s)",
-                     "  Selected LSA-id=85", "  LENGTH=3 octet(s)", "  Selected LSA-Id Value=123456",
-                     "SMS MSC Number Tag=86", "  LENGTH=3 octet(s)",
-                     "  Numbering Plan Ind=ISDN/telephony Number Plan",
-                     "  Nature Of Address=International Number", "  Extension Indicator=No Extension",
-                     "  ISDN Address Digits=123f",
-                     "  Geodetic Information=87", "  LENGTH=2 octet(s)", "  Geodetic Information=abcd",
-                     "  Current Location Retrieved=88", "  LENGTH(null)=0 octet(s)"}));
-    EXPECT_EQ(d.md.errorFlags, 0u);
-    // Display names that differ from the decoded-field names.
-    const auto shown = [&](uint32_t id) {
-        for (size_t i = 0; i < d.fields.size(); ++i)
-            if (d.fields[i].id == id)
-                return d.shown[i].text;
-        return std::string("?");
-    };
-    EXPECT_EQ(shown(2049), "Ellips Pt With Uncertain Circle");
-    EXPECT_EQ(shown(2063), "Odd Number Of Addresssignals");
-    EXPECT_EQ(shown(2065), "Routing to Internal Numallowed");
-    EXPECT_EQ(displayIds(d, 2046), (std::vector<uint32_t>{2044}));
-    EXPECT_EQ(displayIds(d, 2109), (std::vector<uint32_t>{2107}));
-
-    // Members come in their order only: an age after the VLR number is left
-    // over, as are ten octets of an ISDN address beyond its 16 digits.
+// Location information members come in their order only: an age after the
+// VLR number is left over, as are octets of an ISDN address beyond its 16
+// digits.  (The member values are compared with tshark.)
+TEST(MobileLocationInformation, MembersInOrderAndDigitLimit) {
     const Decoded late = decode(initialDp(tlv("BF 34", "81 02 91 21 02 01 05")));
     EXPECT_EQ(textsFrom(late, 2059).back(), "  ISDN Address Digits=12");
     EXPECT_EQ(late.find(2046), nullptr);
@@ -228,23 +173,6 @@ TEST(MobileLocationInformation, EveryMemberInItsOrder) {
     const Decoded longVlr = decode(initialDp(tlv("BF 34", "81 0B 91 21 43 65 87 A9 21 43 65 87 A9")));
     EXPECT_EQ(textsFrom(longVlr, 2058), (Texts{"  ISDN Address Digits=123456789a123456"}));
     EXPECT_EQ(longVlr.md.errorFlags, DPX_ERR_LEFTOVER);
-}
-
-TEST(MobileSubscriberState, AlternativeChosenByItsIdentifier) {
-    const TextCase cases[] = { // texts after the subscriber state's length
-        {"80 00", {"  Assumed Idle=80", "  LENGTH=0 octet(s)"}, 0},
-        {"81 00", {"  Camel Busy=81", "  LENGTH=0 octet(s)"}, 0},
-        {"0A 01 01", {"  Net Det Not Reachable=a", "  LENGTH=1 octet(s)", "  Not Reachable Reason=IMSI Detached"}, 0},
-        {"0A 01 04", {"  Net Det Not Reachable=a", "  LENGTH=1 octet(s)", "  Not Reachable Reason="}, 0},
-        {"82 00", {"  Not Provided From VLR=82", "  LENGTH=0 octet(s)"}, 0},
-        {"83 00", {}, DPX_ERR_LEFTOVER},
-    };
-    for (const auto &c : cases) {
-        Texts texts{"Subscriber State Tag=33bf",
-                    "  LENGTH=" + std::to_string(hexBytes(c.content).size()) + " octet(s)"};
-        texts.insert(texts.end(), c.texts.begin(), c.texts.end());
-        expectTexts(tlv("BF 33", c.content), 2110, texts, c.flags);
-    }
 }
 
 } // namespace

@@ -60,15 +60,6 @@ void check(const Case &c, bool sequence = true) {
 // odd/even indicator, filler after an odd count.
 TEST(PartyNumbers, CalledCallingAndChargeNumbers) {
     const Case cases[] = {
-        {"called, odd: three digits and a filler", kInitialDp, "82 04 83 10 B1 5C", 1614,
-         {"Called Party Number Tag=82", "  LENGTH=4 octet(s)",
-          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd", "Spare=0",
-          "  Numbering Plan Indicator=ISDN/telephony", "Internal Network Num Ind=Routing to Innallowed",
-          "  Called Party Num=1bc", "Filler=5"}},
-        {"called, even: four digits", kInitialDp, "82 04 7F F5 B1 5C", 1614,
-         {"Called Party Number Tag=82", "  LENGTH=4 octet(s)", "  Nature Of Address Ind=Spare (127)",
-          "  Odd/even Indicator=Even", "Spare=5", "  Numbering Plan Indicator=Spare(7)",
-          "Internal Network Num Ind=Routing to Inn Notallowed", "  Called Party Num=1bc5"}},
         {"called, odd, no digit octets", kInitialDp, "82 02 83 10", 1614,
          {"Called Party Number Tag=82", "  LENGTH=2 octet(s)",
           "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd", "Spare=0",
@@ -81,10 +72,6 @@ TEST(PartyNumbers, CalledCallingAndChargeNumbers) {
           "  Nature Of Address Ind=International Number", "  Odd/even Indicator=Odd", "Spare=0",
           "  Numbering Plan Indicator=ISDN/telephony", "Internal Network Num Ind=Routing to Innallowed",
           "  Called Party Num=12345", "Filler=f"}},
-        // No name for 127 in a charge number.
-        {"charge, odd", kConnect, "93 04 FF 50 21 C3", 1939,
-         {"Charge Number Tag=93", "  LENGTH=4 octet(s)", "  Nature Of Address Ind=", "  Odd/even Indicator=Odd",
-          "  Numbering Plan Indicator=Private Numbering Plan", "  Address Signal=123", "Filler=c"}},
     };
     for (const auto &c : cases)
         check(c);
@@ -130,25 +117,9 @@ TEST(PartyNumbers, DigitSpansKeysAndDisplay) {
     EXPECT_EQ(shownOf(decode(invoke(kInitialDp, "82 04 7F F5 B1 5C")), 1822), "Spare (7)");
 }
 
-// Generic address bodies: the generic-number layout for generic numbers,
-// the location-number layout for the location number; the redirection
-// numbers show every half-octet.
+// The location number's own name for nature of address 127; the redirection
+// numbers show every half-octet, 16 at most.
 TEST(PartyNumbers, GenericLocationAndRedirectionNumbers) {
-    const Case cases[] = {
-        {"location number", kInitialDp, "8A 04 03 7C 21 43", 1638,
-         {"Location Number Tag=8a", "  LENGTH=4 octet(s)", "  Nature Of Address Ind=National (significant) Num",
-          "  Odd/even Indicator=Even", "  Screening Indicator=Reserved", "  Numbering Plan Indicator=Spare (7)",
-          "Internal Network Num Ind=Routing to Inn Allowed", "  Pres. Restric. Indicator=Spare",
-          "  Address Signal In Generic=1234"}},
-        {"redirecting party id", kInitialDp, "9D 04 83 5B 21 F3", 1812,
-         {"Redirecting Party Id Tag=9d", "  LENGTH=4 octet(s)",
-          "  Nature Of Address Ind=National (significant) Num", "  Odd/even Indicator=Odd",
-          "  Numbering Plan Indicator=Private Numbering Plan", "  Pres. Restric. Indicator=Address Not Available",
-          "  Address Signal In Redir=123f"}},
-    };
-    for (const auto &c : cases)
-        check(c);
-
     // Generic Address nature of address 127 is shown "Spare (127)".
     const auto location = decode(invoke(kInitialDp, "8A 03 7F 7C 21"));
     EXPECT_EQ(location.find(3557)->text, "  Nature Of Address Ind=Spare(127)");
@@ -188,35 +159,13 @@ TEST(PartyNumbers, IsupParameters) {
 }
 
 TEST(PartyNumbers, BearerCapability) {
-    const Texts speechHead = {"Bearer Capability Tag=bb", "  LENGTH=5 octet(s)", "Choice=Bearer Cap TAG",
-                              "  LENGTH=3 octet(s)"};
-    const auto with = [](Texts head, const Texts &tail) {
-        head.insert(head.end(), tail.begin(), tail.end());
-        return head;
-    };
-    const Case cases[] = {
-        {"speech", kInitialDp, "BB 05 80 03 80 90 A3", 1698,
-         with(speechHead,
-              {"  Information Transfer Capability=Speech", "  Coding Standard=CCITT Standardised Coding",
-               "  Extension Bit=No extension", "  Information Transfer Rate=64 Kbit/s",
-               "  Transfer Mode=Circuit Mode", "  Extension Bit=No extension", "  Extension Bit=No extension",
-               "  Layer Id=Layer 1", "  User information layer 1 protocol=Recommendation G.711 A-law"})},
-        // Octet 4.1 follows the multirate code only.
-        {"multirate", kInitialDp, "BB 05 80 03 88 98 86", 1698,
-         with(speechHead,
-              {"  Information Transfer Capability=Unrestricted Digital Information",
-               "  Coding Standard=CCITT Standardised Coding", "  Extension Bit=No extension",
-               "  Information Transfer Rate=Multirate(64 Kbit/s Base Rate)", "  Transfer Mode=Circuit Mode",
-               "  Extension Bit=No extension", "  Rate multiplier=6", "  Extension Bit=No extension"})},
-        {"invalid layer, raw data", kInitialDp, "BB 07 80 05 90 90 01 77 08", 1698,
-         {"Bearer Capability Tag=bb", "  LENGTH=7 octet(s)", "Choice=Bearer Cap TAG", "  LENGTH=5 octet(s)",
-          "  Information Transfer Capability=3.1 Khz Audio", "  Coding Standard=CCITT Standardised Coding",
-          "  Extension Bit=No extension", "  Information Transfer Rate=64 Kbit/s",
-          "  Transfer Mode=Circuit Mode", "  Extension Bit=No extension", "  Extension Bit=Extension",
-          "  Layer Id=Invalid", "  Invalid Data=1", " Raw Data=7708"}},
-    };
-    for (const auto &c : cases)
-        check(c);
+    // An invalid layer id: the rest of the octets shown raw.
+    check({"invalid layer, raw data", kInitialDp, "BB 07 80 05 90 90 01 77 08", 1698,
+           {"Bearer Capability Tag=bb", "  LENGTH=7 octet(s)", "Choice=Bearer Cap TAG", "  LENGTH=5 octet(s)",
+            "  Information Transfer Capability=3.1 Khz Audio", "  Coding Standard=CCITT Standardised Coding",
+            "  Extension Bit=No extension", "  Information Transfer Rate=64 Kbit/s",
+            "  Transfer Mode=Circuit Mode", "  Extension Bit=No extension", "  Extension Bit=Extension",
+            "  Layer Id=Invalid", "  Invalid Data=1", " Raw Data=7708"}});
 
     // Layer 1 with V.110 octets 5a to 5d, layer 2, layer 3 with 7a and 7b.
     const auto d = decode(invoke(kInitialDp, "BB 0D 80 0B 88 90 21 4F 3B 55 91 C2 6B 0C 8C"));
