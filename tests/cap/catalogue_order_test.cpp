@@ -3,17 +3,9 @@
 // catalogue_order checks the order itself with tools/catalogue/order_fields.py).
 #include <gtest/gtest.h>
 
-#include <string>
-
 #include "fields/field_table.h"
 
 namespace {
-
-std::string withoutLeadingBlanks(const char *label) {
-    const std::string s = label;
-    const size_t first = s.find_first_not_of(' ');
-    return first == std::string::npos ? std::string() : s.substr(first);
-}
 
 // Every display id that is stated outright, by field id.  Each is evidence
 // of the catalogue order: the display id is the first field with the label.
@@ -51,23 +43,6 @@ TEST(Catalogue, StatedDisplayIdsHold) {
     }
     if (camel::kFieldCount >= 1492) {
         EXPECT_EQ(undeclared, 0u);
-    }
-}
-
-// The display ids computed at compile time (one hashed pass) agree with the
-// rule applied the slow way, for every field.
-// A field declared with a display id of its own (2231 under 2230) keeps it.
-TEST(Catalogue, DisplayIdIsTheFirstFieldWithTheLabel) {
-    for (size_t i = 0; i < camel::kFieldCount; ++i) {
-        if (camel::kFields[i].shownUnder != 0) {
-            EXPECT_EQ(camel::kDisplayIds.id[i], camel::kFields[i].shownUnder);
-            continue;
-        }
-        const std::string label = withoutLeadingBlanks(camel::kFields[i].label);
-        size_t first = 0;
-        while (withoutLeadingBlanks(camel::kFields[first].label) != label)
-            ++first;
-        EXPECT_EQ(camel::kDisplayIds.id[i], camel::kFields[first].id) << camel::kFields[i].id;
     }
 }
 

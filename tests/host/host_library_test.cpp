@@ -1,5 +1,6 @@
-// The stand-in host libraries: what they record, how failures are injected,
-// access point name rendering and the key table layout they hand out.
+// The stand-in host libraries: how failures are injected, access point name
+// rendering and the key table layout they hand out.  (What they record and the
+// states they prepare are what every end-to-end test starts from.)
 
 #include "dpx_standin_host.h"
 
@@ -12,32 +13,6 @@
 #include <vector>
 
 namespace {
-
-TEST(HostRecorder, CopiesFieldsBeforeTheCallReturnsAndCutsTextsAt255) {
-    host_ClearRecords();
-    char text[] = "Invoke ID=1";
-    std::string label(300, 'b');
-    ValueSpan span{0x01, 9, 16, 0, {0, 0}};
-    pu_AddDecodedFieldsData(nullptr, 1, &span, text, 1, label.data(), 1066, 0, 5);
-    pu_AddFieldsToDisplayData(nullptr, label.data(), 12);
-    // The module reuses its buffers for the next field at once.
-    std::strcpy(text, "changed");
-    span.value = 0xFF;
-
-    ASSERT_EQ(host_DecodedCount(), 1u);
-    const HostDecodedField *f = host_Decoded(0);
-    EXPECT_STREQ(f->text, "Invoke ID=1");
-    EXPECT_EQ(f->label, std::string(255, 'b'));
-    EXPECT_EQ(std::tuple(f->fieldId, f->selector, f->arg9), std::tuple(1066u, 1u, 5u));
-    ASSERT_EQ(f->spanCount, 1u);
-    EXPECT_EQ(f->spans[0].value, 0x01u);
-    EXPECT_EQ(host_Decoded(1), nullptr);
-    ASSERT_EQ(host_DisplayCount(), 1u);
-    EXPECT_EQ(host_Display(0)->text, std::string(255, 'b'));
-    EXPECT_EQ(host_Display(0)->displayId, 12u);
-    host_ClearRecords();
-    EXPECT_EQ(host_DecodedCount() + host_DisplayCount(), 0u);
-}
 
 TEST(HostRealloc, FailsExactlyTheNthCallCountedFromTheSetting) {
     host_SetReallocFailAt(3);

@@ -9,7 +9,6 @@
 
 #include <cstdio>
 #include <fstream>
-#include <map>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -68,47 +67,25 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
     const std::vector<json> objects = r.objects();
     ASSERT_EQ(objects.size(), hex.size());
 
-    const std::map<std::string, std::string> typeNames = {
-        {"61", "Unidirectional"}, {"62", "Begin"}, {"64", "End"}, {"65", "Continue"}, {"67", "Abort"}};
-    std::map<std::string, int> typesSeen;
+    // Every message with the member of each pass (the passes' agreement over
+    // the samples is checked by the samples test).
     for (size_t i = 0; i < objects.size(); ++i) {
         const json &o = objects[i];
         SCOPED_TRACE(hex[i]);
         EXPECT_EQ(o["index"], i);
         EXPECT_EQ(o["hex"], hex[i]);
-        const json &md = o["md"];
         for (const char *pass : {"md", "display", "view", "keys"}) {
-            ASSERT_TRUE(o.contains(pass)) << pass;
             EXPECT_EQ(o[pass]["result"], 1) << pass;
-            // The passes walk the same bits and reach the same verdict.
-            EXPECT_EQ(o[pass]["errorFlags"], md["errorFlags"]) << pass;
-            EXPECT_EQ(o[pass]["remainingBits"], md["remainingBits"]) << pass;
-            EXPECT_TRUE(o[pass]["errorFlags"].is_number_unsigned()) << pass;
+            EXPECT_EQ(o[pass]["errorFlags"], o["md"]["errorFlags"]) << pass;
         }
-        EXPECT_EQ(o["view"]["status"], md["errorFlags"] == 0 ? 0 : DPX_STATUS_INVALID);
-        EXPECT_EQ(md["layer"]["first"], 1);
-        ASSERT_FALSE(md["fields"].empty());
-        EXPECT_EQ(o["display"]["fields"].size(), md["fields"].size());
-
-        // Every message starts with its type, bits 1 to 8, also key entry 0.
-        const std::string type = hex[i].substr(0, 2);
-        ASSERT_TRUE(typeNames.count(type)) << type;
-        ++typesSeen[type];
-        const int code = std::stoi(type, nullptr, 16);
-        EXPECT_EQ(md["fields"][0], json({{"id", 3604},
-                                         {"label", "MT"},
-                                         {"text", "MT=" + typeNames.at(type)},
-                                         {"value", typeNames.at(type)},
-                                         {"selector", 0},
-                                         {"spans", {{1, 8, code}}}}));
-        EXPECT_EQ(o["keys"]["entries"][0],
-                  json({{"index", 0}, {"name", "MT"}, {"value", type}, {"bits", 8}, {"text", std::to_string(code)}}));
+        EXPECT_EQ(o["view"]["status"], o["md"]["errorFlags"] == 0 ? 0 : DPX_STATUS_INVALID);
     }
-    EXPECT_EQ(typesSeen.size(), typeNames.size()) << "samples cover every message type";
 
     ASSERT_EQ(hex[0], "6206480401020304"); // the first sample in full
     const json &o = objects[0];
     EXPECT_EQ(o["md"]["layer"], json::parse(R"({"first":1,"last":64})"));
+    EXPECT_EQ(o["md"]["fields"][0],
+              json::parse(R"({"id":3604,"label":"MT","text":"MT=Begin","value":"Begin","selector":0,"spans":[[1,8,98]]})"));
     EXPECT_EQ(o["display"]["fields"][0], json::parse(R"({"displayId":3604,"text":"Begin","label":"MT"})"));
     EXPECT_EQ(o["keys"]["entries"][1],
               json::parse(
