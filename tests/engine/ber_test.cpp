@@ -93,7 +93,7 @@ constexpr Member kItemRow[] = {primitiveRow(0x02)};
 constexpr MemberTable kItems = members(Walk::Repeat, kItemRow);
 
 // Single fields and small shapes as units.
-enum class Leaf { Octet, ClassNumber, TwoOctet, Length, HeaderLength, Digits, Problem, Items, Id, Wrapper };
+enum class Leaf { Octet, ClassNumber, TwoOctet, Length, HeaderLength, Digits, Items, Id, Wrapper };
 template <Leaf L>
 struct Unit {
     template <Pass P>
@@ -110,12 +110,7 @@ struct Unit {
             return lengthField<P, 3606>(st, ctx, rq);
         else if constexpr (L == Leaf::Digits) // far more than a text line holds
             return halfOctetField<P, 3653>(st, ctx, rq, 300);
-        else if constexpr (L == Leaf::Problem) {
-            // The alternative's identifier octet, then the alternative it names.
-            if (!choiceField<P, 3701>(st, ctx, rq))
-                return 0;
-            return ctx->present == 0 || g_scratch<P>.choiceTag != 0x81 || octetField<P, 3712>(st, ctx, rq);
-        } else if constexpr (L == Leaf::Items) // SEQUENCE OF primitives 02
+        else if constexpr (L == Leaf::Items) // SEQUENCE OF primitives 02
             return walkTable<P>(st, ctx, rq, kItems);
         else if constexpr (L == Leaf::Id) // three fixed one-octet fields, no window
             return !tagTest(st, 0x02) || octetFieldsElement<P, 3703, 3704, 3705>(st, ctx, rq, "Id");
@@ -449,7 +444,7 @@ TEST(BerContentBlock, WindowedAndEndOfContentsForms) {
     EXPECT_EQ(r.shown.back().displayId, 1065u);
 }
 
-// ---- Element loop, choice, repetition, field fit ---------------------------------
+// ---- Element loop, repetition, field fit -------------------------------------------
 
 TEST(BerElementLoop, Sweeps) {
     struct Case {
@@ -478,24 +473,6 @@ TEST(BerElementLoop, Sweeps) {
             EXPECT_EQ(r.fields.back().spans, (Spans{{33, 40, 1}, {41, 48, 0x81}, {49, 56, 1}, {57, 64, 2}}));
             EXPECT_EQ(r.fields.back().selector, 3u);
         }
-    }
-}
-
-TEST(BerChoice, IdentifierOctetNamedAndKeptForTheSelection) {
-    struct Case {
-        const char *bytes;
-        Texts texts;
-        uint32_t choiceTag, present;
-    } cases[] = {
-        {"81 02", {"  Problem Code=Invoke", "  Problem Code=MistypedParameter"}, 0x81, 1},
-        {"85 02", {"  Problem Code="}, 0x85, 1}, // no name: empty text
-        {"", {}, 0, 0},
-    };
-    for (const Case &c : cases) {
-        const auto r = run<Unit<Leaf::Problem>>(c.bytes);
-        EXPECT_EQ(r.texts(), c.texts) << c.bytes;
-        EXPECT_EQ(r.md.scratch.choiceTag, c.choiceTag) << c.bytes;
-        EXPECT_EQ(r.md.ctx.present, c.present) << c.bytes;
     }
 }
 

@@ -1,6 +1,6 @@
 // dpx-decode on capture files built in memory with the capture writer:
-// where each message came from in text and JSON, --summary and --stats,
-// standard input, captures without CAMEL traffic, and damaged captures
+// where each message came from in text and JSON, standard input, captures
+// without CAMEL traffic, and damaged captures
 // (every frame before the damage decoded, then exit status 3 with the
 // frame number).
 
@@ -107,25 +107,6 @@ TEST_F(DpxDecodeCapture, StandardInputMayHoldACaptureOrHex) {
     const Outcome h = run("--pass view", Bytes(hex.begin(), hex.end()));
     EXPECT_EQ(h.status, 0) << h.err;
     EXPECT_EQ(h.out, "message 0: 6206480401020304\nview: valid\n\n");
-}
-
-TEST_F(DpxDecodeCapture, SummaryAndStatistics) {
-    const std::string file = tempFile("flow", capture({kBegin, {}, kEnd}));
-    const Outcome s = run("--summary " + quote(file));
-    ASSERT_EQ(s.status, 0) << s.err;
-    EXPECT_EQ(s.out, "frame 1 2026-01-01T00:00:00.000000Z pc 100>200 ssn 147>146 gt ->- Begin otid=01020304 dtid=-\n"
-                     "frame 3 2026-01-01T00:00:00.002000Z pc 100>200 ssn 147>146 gt ->- End otid=- dtid=01020304\n");
-    const Outcome st = run("--stats --pass view " + quote(file));
-    ASSERT_EQ(st.status, 0) << st.err;
-    const Lines l = st.lines();
-    ASSERT_GE(l.size(), 4u);
-    EXPECT_EQ(Lines(l.end() - 4, l.end()), (Lines{"stats: 3 frames, 2 messages", "message type Begin: 1",
-                                                  "message type End: 1", "skipped link: neither IP nor SS7: 1"}));
-    const Outcome sj = run("--stats --summary --format json " + quote(file));
-    ASSERT_EQ(sj.status, 0) << sj.err;
-    const json stats = json::parse(sj.lines().back())["stats"];
-    EXPECT_EQ(stats["frames"], 3);
-    EXPECT_EQ(stats["messageTypes"], json::parse(R"({"Begin":1,"End":1})"));
 }
 
 TEST_F(DpxDecodeCapture, CaptureWithoutCamelSaysWhatItHoldsAndExitsWithFour) {
