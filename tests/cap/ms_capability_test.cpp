@@ -137,20 +137,6 @@ TEST(MsRadioAccessCapability, EveryGrowthFailureEndsThePassWithZero) {
     EXPECT_GT(checkReallocFailures(element("e5 60", kBodies[0].body), kElement), 8u);
 }
 
-TEST(MsRadioAccessCapability, FieldIdsFollowTheRecordSlots) {
-    // The first record's fields carry their family ids, the second record's
-    // the ids of the second slot; the header and the padding their own.
-    const Decoded d = walk(element("e5 60", kBodies[0].body), kElement);
-    std::vector<uint32_t> ids;
-    for (const Field &f : d.fields)
-        if (f.id >= 3919 && f.id <= 4139)
-            ids.push_back(f.id);
-    EXPECT_EQ(ids, (std::vector<uint32_t>{3920, 3919, 3921, 3926, 3927, 3972, 3973, 3974, 3975, 3976, 3977,
-                                          3978, 3929, 3930, 3931, 3932, 3922, 3923, 3924, 3947, 3948, 3925,
-                                          3944, 3945, 3933, 3934, 3935, 3936, 3937, 3949, 3950, 3951, 3952,
-                                          3953, 3964, 4128}));
-}
-
 TEST(MsRadioAccessCapability, FieldsThatStraddleOctetsAreOneFieldOfTwoSpans) {
     // Body octets from position 65 on (the element's tag and length, the
     // network capability and the radio access tag and length take 8 octets).
