@@ -229,14 +229,17 @@ void WorkerPool::emit(uint64_t batch) {
         uint64_t index = 0;
         in += readInput(s.input + in, message_, origin_, index);
         if (i < done) {
-            OutputHead head;
-            std::memcpy(&head, s.output + out, sizeof head);
+            OutputHead head{};
+            if (h.outputUsed <= kOutputBytes && sizeof head <= h.outputUsed - out)
+                std::memcpy(&head, s.output + out, sizeof head);
             const auto *text = reinterpret_cast<const char *>(s.output + out + sizeof head);
             const char *record = text + head.textSize;
             size_t pos = 0;
             const bool selected = head.selected != 0;
             const bool counted = settings_.stats && selected;
-            if ((!settings_.follow || getFacts(record, head.recordSize, pos, facts_)) &&
+            const bool inside = h.outputUsed <= kOutputBytes && sizeof head <= h.outputUsed - out &&
+                                uint64_t(head.textSize) + head.recordSize <= h.outputUsed - out - sizeof head;
+            if (inside && (!settings_.follow || getFacts(record, head.recordSize, pos, facts_)) &&
                 (!counted || getSummary(record, head.recordSize, pos, summary_))) {
                 sinks_.take(settings_.follow ? &facts_ : nullptr, selected, counted ? &summary_ : nullptr,
                             std::string_view(text, head.textSize));
