@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "capture_writer.h"
+#include "parallel/records.h"
 #include "support/dpx_decode_run.h"
 
 namespace {
@@ -108,6 +109,66 @@ TEST(DpxDecodeJobs, OutputIsTheSameWithAnyNumberOfWorkers) {
         ASSERT_EQ(dpxtest::run("--jobs 1 --flow " + quote(flow) + ' ' + input.files).status,
                   dpxtest::run("--jobs 4 --flow " + quote(flow + "4") + ' ' + input.files).status);
         EXPECT_TRUE(slurp(flow) == slurp(flow + "4")) << input.name;
+    }
+}
+
+// What a worker sends back reads as it was written, into objects that held
+// more before; cut short anywhere, it is refused without reading beyond.
+TEST(DpxDecodeJobs, FactsAndSummariesSurviveTheTripBack) {
+    namespace dl = dpxdecode::dialogues;
+    dl::MessageFacts f;
+    f.index = 41;
+    f.hasOrigin = true;
+    f.frame = 7;
+    f.seconds = -3;
+    f.nanoseconds = 999999999;
+    f.from = dl::End{true, 0x3FFF, true, 146};
+    f.type = dl::MessageType::Continue;
+    f.otid = "0a0b";
+    f.components = {{dl::Component::Kind::Error, true, -128, 7, "unknownLegID"}, {}};
+    f.imsi = "262011234567890";
+    f.causes = {{31, 22, "normal, unspecified"}};
+    f.eventTypes = {{4, 23, "routeSelectFailure"}, {7, -1, ""}};
+    f.hasServiceKey = true;
+    f.serviceKey = 0xFFFFFFFF;
+    f.applicationContext = "0.4.0.0.1.21.3.4";
+    f.capVersion = 3;
+    dpxdecode::MessageSummary s;
+    s.type = "End";
+    s.errorFlags = 0x81;
+    s.components.resize(3);
+    s.componentCount = 2;
+    s.components[1].kind = dpxdecode::ComponentSummary::Kind::Reject;
+    s.components[1].event = "a, b";
+    s.components[1].eventCount = 2;
+    std::string bytes;
+    dpxdecode::parallel::putFacts(bytes, f);
+    dpxdecode::parallel::putSummary(bytes, s);
+
+    dl::MessageFacts f2;
+    f2.components.resize(5);
+    f2.causes.resize(3);
+    dpxdecode::MessageSummary s2;
+    s2.components.resize(6);
+    s2.componentCount = 6;
+    size_t pos = 0;
+    ASSERT_TRUE(dpxdecode::parallel::getFacts(bytes.data(), bytes.size(), pos, f2));
+    ASSERT_TRUE(dpxdecode::parallel::getSummary(bytes.data(), bytes.size(), pos, s2));
+    EXPECT_EQ(pos, bytes.size());
+    std::string again;
+    dpxdecode::parallel::putFacts(again, f2);
+    dpxdecode::parallel::putSummary(again, s2);
+    EXPECT_TRUE(again == bytes);
+    EXPECT_EQ(s2.componentCount, 2u);
+
+    for (size_t cut = 0; cut < bytes.size(); ++cut) {
+        // A copy of exactly `cut` bytes, so a read beyond is caught.
+        const std::vector<char> part(bytes.begin(), bytes.begin() + long(cut));
+        size_t at = 0;
+        const bool whole = dpxdecode::parallel::getFacts(part.data(), cut, at, f2) &&
+                           dpxdecode::parallel::getSummary(part.data(), cut, at, s2);
+        EXPECT_FALSE(whole) << cut;
+        EXPECT_LE(at, cut);
     }
 }
 
