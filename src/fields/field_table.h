@@ -1305,7 +1305,10 @@ inline constexpr FieldDef kFields[] = {
     tagField(2157, "ISDN Address String Tag"),
     tagField(2288, "RP Cause Tag"),
     argLength(2289),
-    enumField(2290, "RP Cause Value", names::sms::kRpCause, 7).indented().key(7, KeyForm::Octet),
+    enumField(2290, "RP Cause Value", names::sms::kRpCause, 7)
+        .otherwise("")
+        .indented()
+        .key(7, KeyForm::Octet),
     tagField(2291, "Sequence Tag"),
     argLength(2292),
     tagField(2295, "SMS Events Tag"),
@@ -1414,7 +1417,7 @@ inline constexpr FieldDef kFields[] = {
     tagField(4318, "Negotiated_QoS_Extension Tag").indented(),
     tagField(2362, "Active Tag"),
     argLength(2363),
-    enumField(2364, "Active Value", names::kFalse).indented(),
+    enumField(2364, "Active Value", names::kFalse).otherwise("").indented(),
     tagField(3881, "Charging Roll Over Tag"),
     argLength(3882),
     enumField(3883, "Choice", names::gprs::kChargingRollOver),
