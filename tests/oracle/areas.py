@@ -1,7 +1,9 @@
 """The argument areas compared with tshark, as data (read by arguments.py).
 
 TYPES and each area's operations, results and errors describe the arguments
-in arguments.py's notation.  VALUES pairs tshark fields with ours, one row a
+in arguments.py's notation, written from the CAP types and not read from the
+decoder's member tables: a wrong identifier or element in a table row then
+shows as a disagreement instead of being mirrored by the messages.  VALUES pairs tshark fields with ours, one row a
 line:  areas | value | containers | tshark fields | our field ids |
 normaliser [| octet shift]  (areas: C call control, A charging, call gap and
 announcements, S SMS, G GPRS; containers: an occurrence counts only inside

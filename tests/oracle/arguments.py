@@ -5,12 +5,14 @@ dpx-decode reports them.
 Each area describes its operations' arguments once, in a small notation
 read by `build`:
 
-    value := '{' row, ... '}'      SEQUENCE or SET contents: each row present
+    value := term ['+' term ...]   the terms' octets one after the other
+    term  := '{' row, ... '}'      SEQUENCE or SET contents: each row present
                                    with its probability (default 1)
            | '<' row, ... '>'      CHOICE: one row, picked by weight
            | '[' TAG lo hi value ']'   lo..hi repetitions of TAG value
-           | name | name(args)     a named type of the area or a typed value
-                                   generator (GEN); args: ints or lo..hi
+           | '(' TAG value ')'     one element
+           | name | name(args)     a named type (areas.TYPES) or a typed value
+                                   generator (GEN); args: numbers, lo..hi, a|b|c
     row   := TAG [probability or weight] value      TAG '-': no identifier
 
 Two checks run over the messages:

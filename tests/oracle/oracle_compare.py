@@ -42,6 +42,11 @@ import tempfile
 import time
 from pathlib import Path
 
+sys.dont_write_bytecode = True     # leave the source and shared tools folders as they are
+sys.path.insert(0, str(Path(__file__).resolve().parent))
+import arguments  # noqa: E402
+import areas  # noqa: E402
+
 SKIP = 77
 MSG_TYPES = ('begin', 'continue', 'end', 'abort', 'unidirectional')
 TYPE_BY_OCTET = {0x61: 'unidirectional', 0x62: 'begin', 0x64: 'end',
@@ -62,9 +67,6 @@ F_INVOKE_ID, F_LINKED_ID = 3705, 3708
 F_OPCODE, F_RESULT_OPCODE, F_ERROR_CODE = 1066, 1068, 1070
 F_PROBLEM_TYPE = 3701
 
-# The result's operation code and the error code are compared (both are
-# decoded after the invoke id of their component).
-RESULT_AND_ERROR_CODES_DECODED = True
 PROBLEM_CODE_FIELDS = {3710: 0x80, 3712: 0x81, 3714: 0x82, 3716: 0x83}
 
 COMPONENT_BY_FIELD = {F_INVOKE: 'invoke', F_RESULT_LAST: 'returnResultLast',
@@ -399,9 +401,9 @@ def component_expectations(cp, ora_comps, e, notes):
             if oc.get('opcode') not in NAMED_OPCODES:
                 notes.add('opcode-unnamed')
         elif ctype == 'returnResultLast':
-            c['opcode'] = oc.get('opcode') if RESULT_AND_ERROR_CODES_DECODED else None
+            c['opcode'] = oc.get('opcode')
         elif ctype == 'returnError':
-            c['error_code'] = oc.get('error_code') if RESULT_AND_ERROR_CODES_DECODED else None
+            c['error_code'] = oc.get('error_code')
         else:
             if oc.get('invoke_id') is None:
                 notes.add('reject-null-invoke-id')
@@ -428,20 +430,6 @@ SCALARS = ('type', 'otid', 'dtid', 'p_abort', 'dialogue', 'acn', 'result', 'abor
 COMPONENT_KEYS = ('type', 'invoke_id', 'linked_id', 'opcode', 'error_code', 'problem')
 
 
-class Stats:
-    def __init__(self):
-        self.compared = {}
-        self.agreed = {}
-        self.rules = {}           # rule -> [count, example hex]
-        self.failures = []        # (index, group, what, hex)
-        self.flags = {}           # error flags of messages no rule adjusts -> [count, hex]
-
-    def count(self, key, ok):
-        self.compared[key] = self.compared.get(key, 0) + 1
-        if ok:
-            self.agreed[key] = self.agreed.get(key, 0) + 1
-
-
 def compare(index, group, hexmsg, ora, ours, stats):
     data = bytes.fromhex(hexmsg)
     notes = set()
@@ -455,8 +443,7 @@ def compare(index, group, hexmsg, ora, ours, stats):
         stats.failures.append((index, group, 'reference: %s' % exc, hexmsg))
         return
     for n in notes:
-        r = stats.rules.setdefault(n, [0, hexmsg])
-        r[0] += 1
+        stats.rule(n, hexmsg)
     if not notes:
         fl = stats.flags.setdefault(ours.get('errorFlags'), [0, hexmsg])
         fl[0] += 1
@@ -557,7 +544,7 @@ def check_mutated(mutated, outputs, stats):
                 # A key value that does not fit its slot ends the key-field
                 # pass with 0: that is the pass's answer, not a fault.
                 ok = True
-                stats.rules.setdefault('key-overflow', [0, hexmsg])[0] += 1
+                stats.rule('key-overflow', hexmsg)
             stats.count('mutated: %s result 1' % p, ok)
             if not ok:
                 stats.failures.append(('m%d' % i, 'mutated ' + why, '%s pass result %r' % (p, r), hexmsg))
@@ -574,8 +561,7 @@ def check_mutated(mutated, outputs, stats):
 
 
 def main(argv=None):
-    here = Path(__file__).resolve().parent
-    repo = here.parent.parent
+    repo = Path(__file__).resolve().parent.parent.parent
     ap = argparse.ArgumentParser(description=__doc__.split('\n')[0])
     ap.add_argument('--decoder', default=str(repo / 'build' / 'native' / 'dpx-decode'),
                     help='dpx-decode executable')
@@ -608,11 +594,7 @@ def main(argv=None):
         return 1
     decoder = [args.emulator, args.decoder] if args.emulator else [args.decoder]
     sys.path.insert(0, str(tools))
-    sys.dont_write_bytecode = True     # leave the shared tools folder as it is
     import capgen  # noqa: E402 (found only at run time)
-    sys.path.insert(0, str(here))
-    import arguments  # noqa: E402
-    import areas  # noqa: E402
     arguments.init(capgen)
 
     started = time.time()
@@ -674,7 +656,8 @@ def main(argv=None):
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
-    stats = Stats()
+    stats = arguments.Stats()
+    stats.flags = {}        # error flags of messages no rule adjusts -> [count, hex]
     for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
         compare(i, group, hexmsg, o, u.get('md') or {}, stats)
     check_mutated(mutated, mut, stats)
@@ -707,7 +690,7 @@ def report(stats, n, n_mut, seconds, show):
           'messages decoded with all passes, %.1f s' % (n, n_mut, seconds))
     print('agreement (values compared where tshark or our rules give one):')
     for key in sorted(stats.compared):
-        c, a = stats.compared[key], stats.agreed.get(key, 0)
+        c, a = stats.compared[key]
         print('  %-34s %6d / %-6d%s' % (key, a, c, '' if a == c else '  <-- %d differ' % (c - a)))
     if stats.rules:
         print('rule-aware adjustments (our rules, tshark differs; messages, example):')
