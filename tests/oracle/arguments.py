@@ -528,9 +528,12 @@ def read_rows(text, area):
         cols = [c.strip() for c in line.split('|')]
         if area not in cols[0]:
             continue
-        out.append((cols[1], names(cols[2]) or None, names(cols[3]),
-                    {int(i) for i in cols[4].split()}, normaliser(cols[5]),
-                    int(cols[6]) if len(cols) > 6 else 0))
+        try:
+            out.append((cols[1], names(cols[2]) or None, names(cols[3]),
+                        {int(i) for i in cols[4].split()}, normaliser(cols[5]),
+                        int(cols[6]) if len(cols) > 6 else 0))
+        except (KeyError, ValueError, IndexError, TypeError) as exc:
+            raise ValueError('value row %r: %r' % (line, exc)) from None
     return out
 
 
@@ -820,7 +823,12 @@ def build_corpus(area, per_op, seed):
                               ('error', 500, errors or {})):
         for code, spec in sorted(specs.items()):
             rng = random.Random(seed * 1000 + area['seed'] + base + code)
-            b = build(spec if isinstance(spec, str) else spec[1], types, memo)
+            text = spec if isinstance(spec, str) else spec[1]
+            try:
+                b = build(text, types, memo)
+            except (KeyError, ValueError, IndexError, TypeError) as exc:
+                raise ValueError('%s %s %d: notation %r: %r' % (area['name'], kind, code, text,
+                                                                exc)) from None
             for i in range(per_op):
                 indef = length_forms(i, rng, PARTS + (('seq',) if kind == 'result' else ()))
                 if kind == 'op':
