@@ -611,11 +611,13 @@ def main(argv=None):
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)
     try:
-        f = {k: work / k for k in ('corpus.txt', 'mutated.txt', 'arguments.txt', 'oracle.jsonl',
-                                   'ours.jsonl', 'mutated.jsonl', 'arguments.oracle.jsonl',
-                                   'arguments.pdml', 'arguments.ours.jsonl')}
-        for name, msgs in (('corpus.txt', corpus), ('mutated.txt', mutated),
-                           ('arguments.txt', arg_corpus)):
+        # the reference reads each area's messages in a process of its own
+        parts = [area['name'].replace(' ', '_') + '.' for area, _ in suites]
+        f = {k: work / k for k in ['corpus.txt', 'mutated.txt', 'oracle.jsonl', 'ours.jsonl',
+                                   'mutated.jsonl', 'arguments.ours.jsonl'] +
+             [a + k for a in parts for k in ('txt', 'oracle.jsonl', 'pdml')]}
+        for name, msgs in [('corpus.txt', corpus), ('mutated.txt', mutated)] + \
+                [(a + 'txt', c) for a, (_, c) in zip(parts, suites)]:
             write_hex(f[name], msgs)
         reference = [sys.executable, str(tools / 'oracle.py'), '--jsonl', '-q', '--no-hex',
                      '--tshark', args.tshark]
@@ -624,10 +626,10 @@ def main(argv=None):
             (reference + [str(f['corpus.txt']), '-o', str(f['oracle.jsonl'])], None),
             (json_out + ['md', str(f['corpus.txt'])], f['ours.jsonl']),
             (json_out + ['md,display,view,keys', str(f['mutated.txt'])], f['mutated.jsonl']),
-            (reference + [str(f['arguments.txt']), '-o', str(f['arguments.oracle.jsonl']),
-                       '--pdml', str(f['arguments.pdml'])], None),
-            (json_out + ['md,display,view,keys', str(f['arguments.txt'])],
-             f['arguments.ours.jsonl'])]
+            (json_out + ['md,display,view,keys'] + [str(f[a + 'txt']) for a in parts],
+             f['arguments.ours.jsonl'])] + [
+            (reference + [str(f[a + 'txt']), '-o', str(f[a + 'oracle.jsonl']),
+                          '--pdml', str(f[a + 'pdml'])], None) for a in parts]
         procs = [(cmd, open(out, 'w') if out else subprocess.DEVNULL) for cmd, out in jobs]
         procs = [(cmd, subprocess.Popen(cmd, stdout=out, stderr=subprocess.PIPE, text=True), out)
                  for cmd, out in procs]
@@ -644,8 +646,8 @@ def main(argv=None):
             return 1
         oracle, ours, mut = (read_jsonl(f[k]) for k in ('oracle.jsonl', 'ours.jsonl',
                                                         'mutated.jsonl'))
-        arg_outputs = (arguments.read_pdml(f['arguments.pdml']),
-                       read_jsonl(f['arguments.oracle.jsonl']),
+        arg_outputs = ([x for a in parts for x in arguments.read_pdml(f[a + 'pdml'])],
+                       [x for a in parts for x in read_jsonl(f[a + 'oracle.jsonl'])],
                        read_jsonl(f['arguments.ours.jsonl']))
         counts = [len(oracle), len(ours), len(mut)] + [len(x) for x in arg_outputs]
         if counts != [len(corpus)] * 2 + [len(mutated)] + [len(arg_corpus)] * 3:
