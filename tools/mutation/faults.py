@@ -49,6 +49,8 @@ FAULTS = [
      'return false;',
      'dropped error flag: an unknown element is stepped over silently'),
     # ---- TCAP -------------------------------------------------------------------
+    # Equivalent as the code stands: the message's length field raises the
+    # same flag when its octets are missing.
     ('message-length-flag', 'src/tcap/message.cpp',
      'else\n        st->errorFlags |= DPX_ERR_LENGTH_BEYOND;\n    if (!pushEnd(st))',
      'if (!pushEnd(st))',
