@@ -331,10 +331,10 @@ CS   | cell id: LAC | | gsm_map.cellGlobalIdOrServiceAreaIdFixedLength | 2087 | 
 CS   | cell id: cell identity | | gsm_map.cellGlobalIdOrServiceAreaIdFixedLength | 2088 | cgi:ci
 CS   | LAI: MCC | | e212.lai.mcc | 2079 | digits
 CS   | LAI: MNC | | e212.lai.mnc | 2083 2086 | mnc
-CS   | LAI: LAC | | gsm_map.laiFixedLength | 2087 | lac
-CA   | leg id: sending side | | inap.sendingSideID sendingSideID | 1543 1551 | sending | -2
-CA   | leg id: receiving side | | inap.receivingSideID receivingSideID | 1543 1547 | receiving | -2
-CA   | leg id: side value | | inap.sendingSideID inap.receivingSideID sendingSideID receivingSideID | 1554 | hexint
+CS   | LAI: LAC | | gsm_map.laiFixedLength | 2087 | cgi:lac
+CA   | leg id: sending side | | inap.sendingSideID sendingSideID | 1543 1551 | const:128 | -2
+CA   | leg id: receiving side | | inap.receivingSideID receivingSideID | 1543 1547 | const:129 | -2
+CA   | leg id: side value | | inap.sendingSideID inap.receivingSideID sendingSideID receivingSideID | 1554 | int:16
 CSG  | monitor mode | | monitorMode | 1909 | int
 C    | application timer | | applicationTimer | 1916 | int
 CS   | misc call info: message type | | inap.messageType | 1608 | int
@@ -342,10 +342,10 @@ C    | CG encountered | | cGEncountered | 1637 | int
 C    | call segment id | | callSegmentID newCallSegment | 4181 | octets
 C    | CUG index | | cug_Index | 1193 | int
 C    | CUG interlock | | cug_Interlock | 1948 | uint
-C    | NA Oli info | | naOliInfo | 2017 | hexint
+C    | NA Oli info | | naOliInfo | 2017 | int:16
 C    | carrier selection | | carrier | 1955 | at:0
 C    | alerting pattern: type | | alertingPattern | 1128 | at:2
-C    | service interaction: conference treatment | | conferenceTreatmentIndicator | 1977 | hexint
+C    | service interaction: conference treatment | | conferenceTreatmentIndicator | 1977 | int:16
 C    | service interaction: hold treatment | | holdTreatmentIndicator | 2001 | int
 C    | service interaction: bothway through connection | | bothwayThroughConnectionInd | 1993 | int
 C    | service interaction: connected number treatment | | connectedNumberTreatmentInd | 1996 | int
@@ -368,9 +368,9 @@ C    | ext basic service code: teleservice | ext_basicServiceCode | gsm_map.ext_
 C    | call reference number | | callReferenceNumber | 2135 4177 | octets
 CS   | IDP extension: MS classmark 2 | | ms_Classmark2 | 4218 | octets
 CS   | IDP extension: IMEI | | iMEI | 4221 | octets
-C    | IDP extension: supported CAMEL phases | | supportedCamelPhases | 4192 | bitstring | -1
-C    | IDP extension: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | bitstring | -1
-C    | IDP extension: basic service code | | ext_basicServiceCode2 | 4224 | explicit | -2
+C    | IDP extension: supported CAMEL phases | | supportedCamelPhases | 4192 | octets:-1 | -1
+C    | IDP extension: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | octets:-1 | -1
+C    | IDP extension: basic service code | | ext_basicServiceCode2 | 4224 | octets:-2 | -2
 C    | IDP extension: low layer compatibility | | lowLayerCompatibility lowLayerCompatibility2 | 4228 | octets
 A    | max call period duration | | maxCallPeriodDuration | 1389 | int
 A    | release if duration exceeded | | releaseIfdurationExceeded | 1392 | bool
@@ -401,11 +401,11 @@ A    | inband interval | | interval | 1328 | int
 A    | tone id | | toneID | 1311 | uint
 A    | tone duration | tone_element | toneDuration | 1314 | int
 A    | variable part: integer | | integer | 1359 | int
-A    | variable part: number type of digits | number | isup.generic_digits | 1649 | typeofdigits
+A    | variable part: number type of digits | number | isup.generic_digits | 1649 | bits:0:5
 A    | variable part: number digits | number | isup.generic_digits | 3539 3551 | gdigits
 A    | variable part: time hour | | time | 1362 | at:0
 A    | variable part: time minute | | time | 1363 | at:1
-A    | variable part: date year | | date | 1366 | year
+A    | variable part: date year | | date | 1366 | uint:2
 A    | variable part: date month | | date | 1367 | at:2
 A    | variable part: date day | | date | 1368 | at:3
 A    | variable part: price | | price | 1371 | octets
@@ -424,10 +424,10 @@ A    | collected digits: error treatment | | errorTreatment | 1884 | int
 A    | collected digits: interruptable announcement | | interruptableAnnInd | 1887 | bool
 A    | collected digits: voice information | | voiceInformation | 1891 | bool
 A    | collected digits: voice back | | voiceBack | 1895 | bool
-A    | digits response: type of digits | digitsResponse | isup.generic_digits | 1647 | typeofdigits
+A    | digits response: type of digits | digitsResponse | isup.generic_digits | 1647 | bits:0:5
 A    | digits response: digits | digitsResponse | isup.generic_digits | 3536 3548 | gdigits
-A    | initiate call attempt: supported CAMEL phases | | supportedCamelPhases | 4192 | bitstring | -1
-A    | initiate call attempt: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | bitstring | -1
+A    | initiate call attempt: supported CAMEL phases | | supportedCamelPhases | 4192 | octets:-1 | -1
+A    | initiate call attempt: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | octets:-1 | -1
 A    | cancel failed: problem | | problem | 1924 | int
 A    | cancel failed: operation | | operation | 1927 | int8
 A    | requested info error | | PAR_requestedInfoError | 1930 | int
@@ -444,8 +444,8 @@ S    | SMS address nature of address | SMS_ADDRESSES | gsm_map.nature_of_number 
 S    | SMS address numbering plan | SMS_ADDRESSES | gsm_map.number_plan | 2054 | int
 G    | event type GPRS | | gPRSEventType | 2433 | int
 G    | MSISDN digits | mSISDN | e164.msisdn gsm_map.address.digits e212.imsi | 2058 | filler
-G    | PDP type organisation | | pDPTypeOrganization | 2472 | hexint
-G    | PDP type number | | pDPTypeNumber | 2475 | hexint
+G    | PDP type organisation | | pDPTypeOrganization | 2472 | int:16
+G    | PDP type number | | pDPTypeNumber | 2475 | int:16
 G    | PDP address | | pDPAddress | 2478 | octets
 G    | access point name octets | | accessPointName | 2413 | octets
 G    | RAI: MCC | routeingAreaIdentity | e212.rai.mcc | 2442 | digits
@@ -456,12 +456,12 @@ G    | location: cell or LAI MCC | | cellGlobalIdOrServiceAreaIdOrLAI | 2079 | c
 G    | location: cell or LAI MNC | | cellGlobalIdOrServiceAreaIdOrLAI | 2083 2086 | cgi:mnc
 G    | location: cell or LAI LAC | | cellGlobalIdOrServiceAreaIdOrLAI | 2087 | cgi:lac
 G    | charging id | | chargingID | 2463 | octets
-G    | SGSN capabilities: AOC support | | sGSNCapabilities | 2554 | aoc
-G    | GSN address | | gsn_Address gGSNAddress | 2594 2590 | gsn
+G    | SGSN capabilities: AOC support | | sGSNCapabilities | 2554 | bits:0:1
+G    | GSN address | | gsn_Address gGSNAddress | 2594 2590 | octets:1
 G    | PDP initiation type | | pDPInitiationType | 2583 | int
 G    | initiating entity | | initiatingEntity | 2484 | int
-G    | GPRS cause | | gprsCause gPRSCause | 2424 | hexint
-G    | PDP ID | | pDPID pdpID | 1270 | hexint
+G    | GPRS cause | | gprsCause gPRSCause | 2424 | int:16
+G    | PDP ID | | pDPID pdpID | 1270 | int:16
 G    | misc info: message type | | inap.messageType messageType | 1608 | int
 G    | active | | active | 2364 | bool
 G    | max transferred volume | | maxTransferredVolume | 2317 | int

@@ -462,26 +462,24 @@ def n_capped(limit, rule):
 
 
 NORMS = {
-    'int': lambda show, off, size, data: (int(show, 0), None),
+    'int': lambda base='0': lambda show, off, size, data: (int(show, int(base)), None),
     'int8': lambda show, off, size, data: (int(show) % 256, None),      # shown signed
-    'hexint': lambda show, off, size, data: (int(show, 16), None),     # "02"
     'bool': lambda show, off, size, data: (int(show, 0) != 0, None),
     'digits': lambda show, off, size, data: (show.lower(), None),
-    'octets': lambda show, off, size, data: (data[off:off + size].hex(), None),
-    # a value shown by tshark as octets, read as one unsigned number
-    'uint': lambda show, off, size, data: (int.from_bytes(data[off:off + size], 'big'), None),
-    # a BIT STRING: tshark's field starts after the unused-bits octet
-    'bitstring': lambda show, off, size, data: (data[off - 1:off + size].hex(), None),
-    # an explicitly tagged CHOICE shown at its inner value; ours: the whole
-    # content (inner identifier, length and value)
-    'explicit': lambda show, off, size, data: (data[off - 2:off + size].hex(), None),
+    'const': lambda v: lambda show, off, size, data: (int(v), None),
+    # the octets tshark's field covers; octets:N: from N octets after its
+    # start (a BIT STRING's field starts after the unused-bits octet, an
+    # explicitly tagged CHOICE's at its inner value, ours at the content)
+    'octets': lambda first='0': lambda show, off, size, data: (
+        data[off + int(first):off + size].hex(), None),
+    # a value shown by tshark as octets, read as one unsigned number (of at
+    # most N octets)
+    'uint': lambda n=None: lambda show, off, size, data: (
+        int.from_bytes(data[off:off + (size if n is None else int(n))], 'big'), None),
     'at': lambda i: lambda show, off, size, data: (data[off + int(i)], None),
-    'sending': lambda show, off, size, data: (128, None),
-    'receiving': lambda show, off, size, data: (129, None),
     'octet': n_octet, 'mnc': n_mnc, 'cgi': n_cgi, 'time': n_time, 'validity': n_validity,
     'halves': n_half_octets('digits-all-half-octets', False),
     'filler': n_half_octets('tbcd-filler-shown', True),
-    'lac': lambda show, off, size, data: (plmn_at(data, off)[2], None),
     # call stop time: octets as on the wire, the year one 16-bit read, low
     # octet first (tshark: 'hh:mm:ss;dd/mm/yyyy' from swapped BCD)
     'stop': lambda i: lambda show, off, size, data: (
@@ -490,20 +488,17 @@ NORMS = {
     'bits': lambda *a: n_bits(*[int(x) for x in a[:3]],
                               *([tuple(int(v) for v in a[3].split('-'))] if len(a) > 3 else [])),
     'gdigits': n_generic_digits,
-    'typeofdigits': lambda show, off, size, data: (data[off] & 31, None),
-    'year': lambda show, off, size, data: (int.from_bytes(data[off:off + 2], 'big'), None),
     'gapinterval': n_capped(2, 'gap-interval-two-octets'),
     'freeformat': n_capped(52, 'free-format-data-52-octets'),
-    'gsn': lambda show, off, size, data: (data[off + 1:off + size].hex(), None),
-    'aoc': lambda show, off, size, data: (data[off] & 1, None),
     # a CHOICE tshark shows by its index: the identifier [n] constructed
     'choice': lambda show, off, size, data: (0xA0 + int(show), None),
 }
+FACTORIES = ('int', 'const', 'octets', 'uint', 'at', 'cgi', 'time', 'validity', 'stop', 'bits')
 
 
 def normaliser(spec):
     name, *args = spec.split(':')
-    return NORMS[name](*args) if args or name in ('bits',) else NORMS[name]
+    return NORMS[name](*args) if name in FACTORIES else NORMS[name]
 
 
 def o_value(f, want):
@@ -535,6 +530,64 @@ def read_rows(text, area):
         except (KeyError, ValueError, IndexError, TypeError) as exc:
             raise ValueError('value row %r: %r' % (line, exc)) from None
     return out
+
+
+# --------------------------------------------------------------------------
+# BER structure of a generated message (well-formed by construction)
+# --------------------------------------------------------------------------
+class Node:
+    __slots__ = ('tag', 'off', 'indef', 'cstart', 'cend', 'end', 'kids')
+
+    def content(self, data):
+        return data[self.cstart:self.cend]
+
+    def kid(self, tag):
+        for k in self.kids:
+            if k.tag == tag:
+                return k
+        return None
+
+
+def parse_node(data, pos):
+    """One BER element at pos -> Node (children parsed for constructed ones)."""
+    n = Node()
+    n.off = pos
+    first = data[pos]
+    p = pos + 1
+    if first & 0x1F == 0x1F:
+        while data[p] & 0x80:
+            p += 1
+        p += 1
+        n.tag = int.from_bytes(data[pos:p], 'big')
+    else:
+        n.tag = first
+    lb = data[p]
+    p += 1
+    n.indef = lb == 0x80
+    if n.indef:
+        length = None
+    elif lb & 0x80:
+        cnt = lb & 0x7F
+        length = int.from_bytes(data[p:p + cnt], 'big')
+        p += cnt
+    else:
+        length = lb
+    n.cstart = p
+    n.kids = []
+    if first & 0x20:
+        q = p
+        while (q < p + length) if length is not None else not (data[q] == 0 and data[q + 1] == 0):
+            k = parse_node(data, q)
+            n.kids.append(k)
+            q = k.end
+        n.cend = q
+        n.end = q + 2 if length is None else q
+    else:
+        n.cend = p + length
+        n.end = n.cend
+    if n.end > len(data):
+        raise ValueError('element at %d runs past the message' % pos)
+    return n
 
 
 # --------------------------------------------------------------------------
@@ -694,9 +747,9 @@ def payload(root, stats, hexmsg):
     return comp.kids[-1 if comp.tag == 0xA1 else 1].off, comp.kids[-1].end, notes
 
 
-def check(area, corpus, pdml, oracle, ours, parse_node, tcap_rules):
+def check(area, corpus, pdml, oracle, ours, tcap_rules):
     """corpus [(label, hex)], tshark's PDML fields and oracle summaries, our
-    four-pass outputs; parse_node: BER reader; tcap_rules(data, root, ora)
+    four-pass outputs; tcap_rules(data, root, ora)
     -> TCAP-level rule names (oracle_compare's expectations)."""
     stats = Stats()
     rows = area['rows']
@@ -734,29 +787,26 @@ def check(area, corpus, pdml, oracle, ours, parse_node, tcap_rules):
     return stats
 
 
-def report(area, stats, show, complete, rule_text):
-    """Summary lines and the number of disagreements.  complete: the corpus is
-    large enough that every row of the table and every rule of the area must
-    have been met."""
-    title = area['title']
-    lines = ['%s (value: agreed / compared):' % title]
-    missing = ['NEVER COMPARED %s: tshark showed it nowhere (table or corpus wrong?)' % r[0]
-               for r in area['rows'] if r[0] not in stats.compared] + \
+def report(title, stats, show, complete, rows, rules, rule_text):
+    """Summary lines and the number of disagreements: every compared value
+    (agreed / compared), every named rule with its count, the differences.
+    complete: the corpus is large enough that every row and every named rule
+    must have been met."""
+    missing = ['NEVER COMPARED %s: tshark showed it nowhere (table or corpus wrong?)' % r
+               for r in rows if r not in stats.compared] + \
         ['RULE NEVER APPLIED %s: no message needed it (rule or corpus wrong?)' % r
-         for r in area['rules'] if r not in stats.rules]
+         for r in rules if r not in stats.rules]
     missing = missing if complete else []
-    lines += ['  ' + m for m in missing]
+    lines = ['%s (value: agreed / compared; rule: messages):' % title] + \
+        ['  ' + m for m in missing]
     bad = len(missing)
     for key in sorted(stats.compared, key=lambda k: (k.startswith('coverage'), k)):
         n, a = stats.compared[key]
         lines.append('  %-48s %6d / %-6d%s' % (key, a, n, '' if a == n else
                                                  '  <-- %d differ' % (n - a)))
-    if stats.rules:
-        lines.append('%s: rules (our rules, tshark differs; messages, example):' % title)
-        for key in sorted(stats.rules):
-            cnt, ex = stats.rules[key]
-            lines.append('  %-36s %6d  %s' % (key, cnt, rule_text.get(key, '')))
-            lines.append('  %36s         e.g. %s' % ('', ex if len(ex) <= 120 else ex[:117] + '...'))
+    for key in sorted(set(rules) | set(stats.rules)):
+        lines.append('  rule %-43s %6d  %s' % (key, stats.rules.get(key, [0])[0],
+                                               rule_text.get(key, '')))
     for name in sorted(stats.by_value):
         for (want, got), (cnt, label, hexmsg) in sorted(stats.by_value[name].items(),
                                                       key=lambda kv: -kv[1][0])[:show]:
@@ -770,6 +820,8 @@ def report(area, stats, show, complete, rule_text):
         if seen.get(k, 0) < max(1, show // 4):
             seen[k] = seen.get(k, 0) + 1
             lines.append('  FAIL %s %s: %s\n      %s' % (what, label, text, hexmsg))
+    lines.append('PASSED (%s)' % title if not bad else 'FAILED (%s): %d disagreements'
+                 % (title, bad))
     return lines, bad
 
 
