@@ -14,6 +14,9 @@ ISUP-format numbers, whose digits and attributes become rows of VALUES.
 TYPES = {
     # call control
     'csid': 'int(1,127)', 'side': 'one(1,2)', 'cug': 'oct(4,4)',
+    'legid': 'one(1,2,1..30)', 'leg': '<80 legid, 81 legid>', 'sending': '(80 legid)',
+    'receiving': '(81 legid)',
+    'ext': '[30 1 2 {02 int(0,127), 0A one(0,1), A1 (04 oct(1,4))}]',
     'sii': '{A0 .4 {81 side, 82 .5 side, 84 .5 side}, A1 .3 {81 side, 82 .5 side}, '
            '82 .4 one(0,1), 84 .3 one(0..3), 8D .2 null, 9F32 .3 side, 9F33 .3 side, '
            '9F34 .3 side}',
@@ -30,7 +33,7 @@ TYPES = {
               '84 .5 octs(4,0x80|0xC0|0xE0|0xF0), 85 .3 octs(0..7) + oct(1,1), A6 .5 bearers, '
               'A7 .4 basicservice, 89 .3 hex(8890), 8A .2 hex(8890a2)}',
     # charging, call gap, announcements
-    'sending': 'leg(0)',
+    'ffd': '<- oct(1,8), - oct(1,40), - oct(1,52), - oct(1,160)>',
     'burst': '{80 .6 ints(1..3), 81 .6 ints(1..127,1..127,128..1200), 82 .6 ints(1..3), '
              '83 .6 ints(1..20), 84 .6 ints(1..20)}',
     'audible': '<01 bool, A1 {80 .6 ints(1..127,128..1200), A1 burst}>',
@@ -55,6 +58,8 @@ TYPES = {
                  '84 .3 oct(1,2), 85 .4 ints(1..127), 86 .4 ints(1..127), 87 .3 one(0,1,2), '
                  '88 .3 bool, 89 .3 bool, 8A .3 bool}',
     # SMS and GPRS
+    'gsn': '<- 6 hex(10) + oct(4,4), - 4 hex(41) + oct(16,16)>',
+    'cellorlai': '<- 7 cell, - 3 lai>', 'rai': 'lai + oct(1,1)',
     'octet': 'octs(0..255)', 'eventtypesms': 'one(1,2,3,11,12,13,0..255)',
     # MS network capability (two octets) and radio access capabilities of
     # several access technologies (GSM E then GSM 1800 with A5 and multislot
@@ -118,17 +123,17 @@ AREAS = [
                   '9F37 .2 null, 9F38 .2 null, 9F39 .2 one(0..255), 9F3A .1 null}'),
              22: ('releaseCall', '04 cause'),
              23: ('requestReportBCSMEvent', '30 {A0 [30 1 4 {80 eventtype, 81 one(0,1,2), '
-                  'A2 .7 leg(0), BE .2 {81 int(0,2047)}, 9F32 .1 null}], A2 .2 ext}'),
-             24: ('eventReportBCSM', '30 {- <%s>, A3 .7 leg(1), A4 .7 {80 one(0,1)}}'
+                  'A2 .7 sending, BE .2 {81 int(0,2047)}, 9F32 .1 null}], A2 .2 ext}'),
+             24: ('eventReportBCSM', '30 {- <%s>, A3 .7 receiving, A4 .7 {80 one(0,1)}}'
                   % ERB_EVENTS),
-             32: ('initiateCallAttempt', '30 {A0 callednumbers, A4 .2 ext, A5 .5 leg(0), '
+             32: ('initiateCallAttempt', '30 {A0 callednumbers, A4 .2 ext, A5 .5 sending, '
                   '86 .4 csid, 9E .6 calling, 9F33 .4 oct(1,8), 9F34 .4 addr, 9F35 .2 null}'),
              33: ('resetTimer', '30 {80 one(0), 81 sk2, A2 .2 ext, 83 .3 csid}'),
              44: ('callInformationReport', '30 {A0 [30 1 4 <- {80 hex(00), A1 {80 int(0,255)}}, '
                   '- {80 hex(01), A1 {81 dtime}}, - {80 hex(02), A1 {82 int(0,2147483647)}}, '
-                  '- {80 hex(1E), A1 {9E cause}}>], A2 .2 ext, A3 .7 leg(1)}'),
+                  '- {80 hex(1E), A1 {9E cause}}>], A2 .2 ext, A3 .7 receiving}'),
              45: ('callInformationRequest', '30 {A0 [0A 1 4 one(0,1,2,30)], A2 .2 ext, '
-                  'A3 .7 leg(0)}'),
+                  'A3 .7 sending}'),
              53: ('cancel', '- <80 6 int(-128,127), 81 4 null>'),
              56: CWA, 88: CWA,
              86: ('dFCWithArgument', '30 {81 .7 csid, A2 .3 ext}'),
@@ -150,7 +155,7 @@ AREAS = [
                   '82 .5 one(0,1)}}'),
              35: ('applyCharging', '30 {80 (A0 tdc), A2 .7 sending, A3 .1 ext, '
                   'BF32 .3 chargingaddress}'),
-             36: ('applyChargingReport', '04 {A0 {A0 leg(1), A1 timeinfo, 82 .7 bool, '
+             36: ('applyChargingReport', '04 {A0 {A0 receiving, A1 timeinfo, 82 .7 bool, '
                   '83 .3 null, A4 .1 ext, A5 .3 chargingaddress}}'),
              41: ('callGap', '30 {A0 gapcriteria, A1 {80 ints(-2..127,128..86400), '
                   '81 ints(-1..127,128..32767,32768..60000)}, 82 .4 one(0,1), '

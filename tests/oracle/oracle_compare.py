@@ -41,6 +41,9 @@ import arguments  # noqa: E402
 import areas  # noqa: E402
 
 SKIP = 77
+PER_GROUP = 1000    # TCAP messages per message type and length form
+MUTATIONS = 2000    # malformed messages
+PER_OP = 200        # argument messages per operation, result operation code and error code
 MSG_TYPES = ('begin', 'continue', 'end', 'abort', 'unidirectional')
 TYPE_BY_OCTET = {0x61: 'unidirectional', 0x62: 'begin', 0x64: 'end',
                  0x65: 'continue', 0x67: 'abort'}
@@ -489,25 +492,15 @@ def main(argv=None):
     ap.add_argument('--tools', default=os.environ.get('DPX_REFERENCE_TOOLS',
                                                       str(repo.parent / 'shared' / 'tools')),
                     help='folder holding capgen.py and oracle.py')
-    ap.add_argument('--tshark', default='tshark')
-    ap.add_argument('--per-group', type=int, default=1000,
-                    help='messages per message type and length form (default 1000)')
-    ap.add_argument('--mutations', type=int, default=2000,
-                    help='malformed messages decoded with all passes (default 2000)')
-    ap.add_argument('--per-op', type=int, default=200,
-                    help='messages per operation, result operation code and error code of '
-                         'the argument areas (default 200)')
     ap.add_argument('--seed', type=int, default=29078)
-    ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
-    ap.add_argument('--keep', help='keep the generated and decoded files in this folder')
     args = ap.parse_args(argv)
 
     tools = Path(args.tools)
     if not (tools / 'capgen.py').is_file() or not (tools / 'oracle.py').is_file():
         print('SKIPPED: reference tools not found in %s' % tools)
         return SKIP
-    if shutil.which(args.tshark) is None:
-        print('SKIPPED: tshark not found (%s)' % args.tshark)
+    if shutil.which('tshark') is None:
+        print('SKIPPED: tshark not found')
         return SKIP
     if not os.access(args.decoder, os.X_OK):
         print('FAILED: decoder %s not found' % args.decoder)
@@ -518,15 +511,14 @@ def main(argv=None):
     arguments.init(capgen)
 
     started = time.time()
-    corpus = build_corpus(capgen, args.per_group, args.seed)
-    mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
+    corpus = build_corpus(capgen, PER_GROUP, args.seed)
+    mutated = build_mutations(capgen, corpus, MUTATIONS, args.seed)
     suites = []
     for area in areas.AREAS:
         area.update(types=areas.TYPES, rows=arguments.read_rows(areas.VALUES, area['letter']))
-        suites.append((area, arguments.build_corpus(area, args.per_op, args.seed)))
+        suites.append((area, arguments.build_corpus(area, PER_OP, args.seed)))
 
-    work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
-    work.mkdir(parents=True, exist_ok=True)
+    work = Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     try:
         # the reference reads each area's messages in a process of its own;
         # ours decodes all argument messages in one run
@@ -534,8 +526,7 @@ def main(argv=None):
         for name, msgs in zip(names, [corpus, mutated] + [c for _, c in suites]):
             with open(work / (name + '.txt'), 'w') as f:
                 f.write(''.join(h + '\n' for _, h in msgs))
-        reference = [sys.executable, str(tools / 'oracle.py'), '--jsonl', '-q', '--no-hex',
-                     '--tshark', args.tshark]
+        reference = [sys.executable, str(tools / 'oracle.py'), '--jsonl', '-q', '--no-hex']
         ours = decoder + ['--format', 'json', '--pass']
         txt = [str(work / (n + '.txt')) for n in names]
         crashed = run([(reference + [txt[0], '-o', str(work / 'tcap.oracle.jsonl')], None),
@@ -554,8 +545,7 @@ def main(argv=None):
                        [x for n in names[2:] for x in read_jsonl(work / (n + '.oracle.jsonl'))],
                        read_jsonl(work / 'arguments.ours.jsonl'))
     finally:
-        if not args.keep:
-            shutil.rmtree(work, ignore_errors=True)
+        shutil.rmtree(work, ignore_errors=True)
     n_args = sum(len(c) for _, c in suites)
     counts = [len(x) for x in outputs + list(arg_outputs)]
     if counts != [len(corpus)] * 2 + [len(mutated)] + [n_args] * 3:
@@ -571,17 +561,16 @@ def main(argv=None):
     print('oracle_compare: %d TCAP messages and %d argument messages compared with tshark, %d '
           'malformed messages decoded with all passes, %.1f s'
           % (len(corpus), n_args, len(mutated), time.time() - started))
-    # large enough that every TCAP rule but key-overflow must have been needed
+    # every TCAP rule but key-overflow (malformed messages only) must be needed
     lines, bad = arguments.report('TCAP messages, components and malformed messages', stats,
-                                  args.show, args.per_group >= 1000, (),
-                                  [r for r in RULE_TEXT if r != 'key-overflow'], RULE_TEXT)
+                                  (), [r for r in RULE_TEXT if r != 'key-overflow'], RULE_TEXT)
     first = 0
     for area, suite_corpus in suites:
         part = [x[first:first + len(suite_corpus)] for x in arg_outputs]
         first += len(suite_corpus)
         area_lines, area_bad = arguments.report(
-            area['title'], arguments.check(area, suite_corpus, *part, tcap_rules), args.show,
-            args.per_op >= 200, [r[0] for r in area['rows']], area['rules'].split(),
+            area['title'], arguments.check(area, suite_corpus, *part, tcap_rules),
+            [r[0] for r in area['rows']], area['rules'].split(),
             areas.RULE_TEXT)
         lines += area_lines
         bad += area_bad
