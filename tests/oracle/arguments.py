@@ -594,6 +594,13 @@ class Stats:
         c[0] += 1
         c[1] += bool(ok)
 
+    def value(self, name, want, have, label, hexmsg):
+        """One compared value; the differences are grouped by value."""
+        self.count(name, have == want)
+        if have != want:
+            key = (repr(want), 'not reported' if have is None else repr(have))
+            self.by_value.setdefault(name, {}).setdefault(key, [0, label, hexmsg])[0] += 1
+
 
 def compare_values(label, hexmsg, tfields, md, payload, rows, stats):
     """tfields: tshark's fields of one message; md: our decoded-field pass.
@@ -618,11 +625,7 @@ def compare_values(label, hexmsg, tfields, md, payload, rows, stats):
             rules.add(rule)
             a, b = off + shift, off + shift + max(size, 1)
             mine = [f for o, f in ours if f['id'] in ids and a <= o < b]
-            have = o_value(mine[0], want) if mine else None
-            stats.count(name, have == want)
-            if have != want:
-                key = (repr(want), 'not reported' if have is None else repr(have))
-                stats.by_value.setdefault(name, {}).setdefault(key, [0, label, hexmsg])[0] += 1
+            stats.value(name, want, o_value(mine[0], want) if mine else None, label, hexmsg)
     rules.discard(None)
     return rules
 

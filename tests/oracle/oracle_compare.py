@@ -366,13 +366,8 @@ def compare(index, group, hexmsg, ora, ours, stats):
         stats.count('value names', False)
         problems.append(t)
     for key in SCALARS:
-        want, have = exp[key], got[key]
-        if want is None and have is None:
-            continue
-        ok = want == have
-        stats.count(key, ok)
-        if not ok:
-            problems.append('%s: ours %r, expected %r' % (key, have, want))
+        if exp[key] is not None or got[key] is not None:
+            stats.value(key, exp[key], got[key], group, hexmsg)
     wc, hc = exp['components'], got['components']
     n_ok = len(hc) == len(wc) or (exp['extra_components_ok'] and len(hc) > len(wc))
     if wc or hc:
@@ -380,15 +375,10 @@ def compare(index, group, hexmsg, ora, ours, stats):
     if not n_ok:
         problems.append('components: ours %d %s, expected %d %s'
                         % (len(hc), [c['type'] for c in hc], len(wc), [c['type'] for c in wc]))
-    for i, (w, h) in enumerate(zip(wc, hc)):
+    for w, h in zip(wc, hc):
         for key in COMPONENT_KEYS:
-            if key not in w and key not in h:
-                continue
-            ok = w.get(key) == h.get(key)
-            stats.count('component ' + key, ok)
-            if not ok:
-                problems.append('component %d %s: ours %r, expected %r'
-                                % (i, key, h.get(key), w.get(key)))
+            if key in w or key in h:
+                stats.value('component ' + key, w.get(key), h.get(key), group, hexmsg)
     for p in problems:
         stats.failures.append((index, group, p, hexmsg))
 
