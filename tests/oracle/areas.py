@@ -13,6 +13,7 @@ ISUP-format numbers, whose digits and attributes become rows of VALUES.
 
 TYPES = {
     # call control
+    'bool': '<- hex(00), - hex(ff), - oct(1,1)>',
     'csid': 'int(1,127)', 'side': 'one(1,2)', 'cug': 'oct(4,4)',
     'legid': 'one(1,2,1..30)', 'leg': '<80 legid, 81 legid>', 'sending': '(80 legid)',
     'receiving': '(81 legid)',

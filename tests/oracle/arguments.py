@@ -46,11 +46,7 @@ def init(capgen):
 # --------------------------------------------------------------------------
 # Typed value generators: rng -> content octets
 # --------------------------------------------------------------------------
-def digits(rng, lo, hi):
-    # tshark's E.164 code trips on "883x": no 8 first (capgen does the same)
-    return C._digits(rng, lo, hi)
-
-
+# C._digits: digits never starting with 8 (tshark's E.164 code trips on "883x")
 def octets(rng, lo, hi):
     return bytes(rng.randrange(256) for _ in range(rng.randint(lo, hi)))
 
@@ -74,17 +70,13 @@ def uint(lo, hi):
     return f
 
 
-def nai(rng):
-    return rng.choice([1, 2, 3, 4, rng.randint(0, 127)])
-
-
 def isup_number(kind, lo):
     """ISUP number: odd/even and nature of address, then INN and numbering
     plan (called), NI, plan, presentation and screening (calling layout), or
     plan and presentation (original called / redirecting)."""
     def f(rng):
-        d = digits(rng, lo, 16)
-        first = C._oe(d) | nai(rng)
+        d = C._digits(rng, lo, 16)
+        first = C._oe(d) | rng.choice([1, 2, 3, 4, rng.randint(0, 127)])
         if kind == 'original':
             second = (rng.randint(0, 7) << 4) | (rng.choice([0, 0, 1, 3]) << 2)
         else:
@@ -123,13 +115,13 @@ def bearer_cap(rng):
 def address_string(lo=6, hi=15):
     return lambda rng: bytes([0x80 | (rng.randint(0, 7) << 4)
                               | rng.choice([1, 1, 0, 3, 4, 6, 8, 9])]) \
-        + C.tbcd(digits(rng, lo, hi))
+        + C.tbcd(C._digits(rng, lo, hi))
 
 
 def imsi(rng):
     mcc, mnc = rng.choice([('262', '01'), ('234', '15'), ('310', '410'), ('208', '10')])
     n = rng.choice([14, 15, 15]) - len(mcc) - len(mnc)
-    return C.tbcd(mcc + mnc + digits(rng, n, n))
+    return C.tbcd(mcc + mnc + C._digits(rng, n, n))
 
 
 def plmn_lac(rng):
@@ -138,15 +130,10 @@ def plmn_lac(rng):
     return C.plmn(mcc, mnc) + rng.randint(0, 65535).to_bytes(2, 'big')
 
 
-def time_and_timezone(rng):
-    return C.time_and_timezone(rng.randint(2000, 2030), rng.randint(1, 12), rng.randint(1, 28),
-                               rng.randint(0, 23), rng.randint(0, 59), rng.randint(0, 59),
-                               rng.randint(-47, 56))
-
-
-def date_and_time(rng):
-    return C.date_and_time(rng.randint(2000, 2030), rng.randint(1, 12), rng.randint(1, 28),
-                           rng.randint(0, 23), rng.randint(0, 59), rng.randint(0, 59))
+def when(rng):
+    """Year, month, day, hour, minute, second."""
+    return [rng.randint(lo, hi) for lo, hi in ((2000, 2030), (1, 12), (1, 28), (0, 23),
+                                               (0, 59), (0, 59))]
 
 
 def service_key(*tops):
@@ -161,10 +148,6 @@ def octs(*values):
                              else rng.randint(*v) for v in values)
 
 
-def boolean(rng):
-    return bytes([rng.choice([0, 0xFF, rng.randint(1, 255)])])
-
-
 def generic_digits(rng):
     """Type of digits (bits 5-1), encoding scheme (bits 8-6), BCD digits
     (low half first) or binary octets."""
@@ -172,7 +155,7 @@ def generic_digits(rng):
     head = bytes([(scheme << 5) | rng.randint(0, 31)])
     if scheme in (0, 1):
         n = rng.randint(1, 8) * 2 - (scheme == 1)
-        return head + C.bcd_isup(digits(rng, n, n))
+        return head + C.bcd_isup(C._digits(rng, n, n))
     return head + octets(rng, 1, 8)
 
 
@@ -198,8 +181,6 @@ def apn(rng):
 
 def pick(*hexes):
     """A constant, or one of a few."""
-    if len(hexes) == 1:
-        return lambda rng: bytes.fromhex(hexes[0])
     return lambda rng: bytes.fromhex(rng.choice(hexes))
 
 
@@ -209,11 +190,13 @@ GEN = {  # name -> builder; with (arguments): name -> factory of a builder
     'oct': lambda lo, hi: (lambda rng: octets(rng, lo, hi)), 'hex': pick,
     'gnum': generic_number, 'addr': address_string, 'called': isup_called,
     'calling': isup_calling, 'original': isup_original, 'cause': cause, 'bearer': bearer_cap,
-    'imsi': imsi, 'lai': plmn_lac, 'time': time_and_timezone, 'dtime': date_and_time,
+    'imsi': imsi, 'lai': plmn_lac,
+    'time': lambda rng: C.time_and_timezone(*when(rng), rng.randint(-47, 56)),
+    'dtime': lambda rng: C.date_and_time(*when(rng)),
     'cell': lambda rng: plmn_lac(rng) + rng.randint(0, 65535).to_bytes(2, 'big'),
-    'skey': service_key, 'octs': octs, 'bool': boolean,
+    'skey': service_key, 'octs': octs,
     'gdigits': generic_digits, 'validity': validity_period, 'apn': apn,
-    'tbcd': lambda lo, hi: (lambda rng: C.tbcd(digits(rng, lo, hi))),
+    'tbcd': lambda lo, hi: (lambda rng: C.tbcd(C._digits(rng, lo, hi))),
     'redirection': lambda rng: bytes([(rng.randint(0, 3) << 4) | rng.randint(0, 6),
                                       (rng.randint(0, 6) << 4) | rng.randint(1, 5)]),
     'text': lambda lo, hi: (lambda rng: bytes(rng.randint(0x20, 0x7E)
@@ -497,58 +480,26 @@ def read_rows(text, area):
 # BER structure of a generated message (well-formed by construction)
 # --------------------------------------------------------------------------
 class Node:
-    __slots__ = ('tag', 'off', 'indef', 'cstart', 'cend', 'end', 'kids')
-
-    def content(self, data):
-        return data[self.cstart:self.cend]
+    """One element: identifier, offset, indefinite length, end (after any
+    end-of-contents) and the elements inside it."""
+    __slots__ = ('tag', 'off', 'indef', 'end', 'kids')
 
     def kid(self, tag):
-        for k in self.kids:
-            if k.tag == tag:
-                return k
-        return None
+        return next((k for k in self.kids if k.tag == tag), None)
 
 
-def parse_node(data, pos):
-    """One BER element at pos -> Node (children parsed for constructed ones)."""
-    n = Node()
-    n.off = pos
-    first = data[pos]
-    p = pos + 1
-    if first & 0x1F == 0x1F:
-        while data[p] & 0x80:
-            p += 1
-        p += 1
-        n.tag = int.from_bytes(data[pos:p], 'big')
-    else:
-        n.tag = first
-    lb = data[p]
-    p += 1
-    n.indef = lb == 0x80
-    if n.indef:
-        length = None
-    elif lb & 0x80:
-        cnt = lb & 0x7F
-        length = int.from_bytes(data[p:p + cnt], 'big')
-        p += cnt
-    else:
-        length = lb
-    n.cstart = p
-    n.kids = []
-    if first & 0x20:
-        q = p
-        while (q < p + length) if length is not None else not (data[q] == 0 and data[q + 1] == 0):
-            k = parse_node(data, q)
-            n.kids.append(k)
-            q = k.end
-        n.cend = q
-        n.end = q + 2 if length is None else q
-    else:
-        n.cend = p + length
-        n.end = n.cend
-    if n.end > len(data):
-        raise ValueError('element at %d runs past the message' % pos)
-    return n
+def parse_message(data):
+    """The message's element tree, from capgen's strict BER reader."""
+    path = []
+    for off, header, length, _, depth, tag, content_end in C.parse_ber(data):
+        n = Node()
+        n.tag, n.off, n.indef, n.kids = int.from_bytes(tag, 'big'), off, length is None, []
+        n.end = content_end + 2 * n.indef
+        del path[depth:]
+        if path:
+            path[-1].kids.append(n)
+        path.append(n)
+    return path[0]
 
 
 # --------------------------------------------------------------------------
@@ -719,7 +670,7 @@ def check(area, corpus, pdml, oracle, ours, tcap_rules):
     rows = area['rows']
     for (label, hexmsg), tfields, ora, out in zip(corpus, pdml, oracle, ours):
         data = bytes.fromhex(hexmsg)
-        root = parse_node(data, 0)
+        root = parse_message(data)
         for tname, rule in area.get('field_rules', {}).items():
             if any(t[0] == tname for t in tfields):
                 stats.rule(rule, hexmsg)

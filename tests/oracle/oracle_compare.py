@@ -350,7 +350,7 @@ def compare(index, group, hexmsg, ora, ours, stats):
     notes = set()
     problems = []
     try:
-        root = arguments.parse_node(data, 0)
+        root = arguments.parse_message(data)
         if ora.get('error'):
             raise Disagreement('oracle: %s' % ora['error'])
         exp = expect(data, root, ora, notes)
