@@ -721,9 +721,9 @@ def report(title, stats, rows, rules, rule_text, show=20):
         lines.append('  rule %-43s %6d  %s' % (key, stats.rules.get(key, [0])[0],
                                                rule_text.get(key, '')))
     for name in sorted(stats.by_value):
+        bad += sum(v[0] for v in stats.by_value[name].values())
         for (want, got), (cnt, label, hexmsg) in sorted(stats.by_value[name].items(),
                                                       key=lambda kv: -kv[1][0])[:show]:
-            bad += cnt
             lines.append('  DIFFER %s: expected %s, ours %s (%d, e.g. %s)\n      %s'
                          % (name, want, got, cnt, label, hexmsg))
     seen = {}
