@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <string_view>
 
 namespace camel {
 
@@ -25,7 +26,8 @@ struct TextBuf {
         len += n;
         data[len] = '\0';
     }
-    void append(const char *s) { append(s, std::strlen(s)); }
+    // A literal's length is known at compile time.
+    void append(std::string_view s) { append(s.data(), s.size()); }
     void blanks(size_t n) {
         static constexpr char kBlanks[] = "        ";
         while (n > 0) {

@@ -101,7 +101,7 @@ void writeKeys(Text &os, const KeysOut &k) {
 void writeSpans(Text &os, const DecodedOut &f) {
     os << ' ';
     for (const SpanOut &s : f.spans)
-        os << " [" << s.first << '-' << s.last << "]=" << s.value;
+        os << " [" << s.firstBit << '-' << s.lastBit << "]=" << s.value;
 }
 
 // The decoded fields as a tree.  An element is a tag field, the length
@@ -157,11 +157,11 @@ void FieldTree::build(const MdOut &md) {
         const FieldKind kind = fieldKind(f.id);
         uint32_t first = lastBit, last = lastBit;
         if (!f.spans.empty()) {
-            first = f.spans[0].first;
-            last = f.spans[0].last;
+            first = f.spans[0].firstBit;
+            last = f.spans[0].lastBit;
             for (const SpanOut &s : f.spans) {
-                first = s.first < first ? s.first : first;
-                last = s.last > last ? s.last : last;
+                first = s.firstBit < first ? s.firstBit : first;
+                last = s.lastBit > last ? s.lastBit : last;
             }
         }
         lastBit = last;
