@@ -7,6 +7,7 @@
 
 #include "host_export.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
@@ -58,11 +59,38 @@ struct DisplayEntry {
     uint32_t text, textLength, displayId; // offset into Recorder::displayChars
 };
 
+// Texts one after the other, each NUL-terminated; only grows, so that
+// recording costs one length scan and one copy per text.
+struct CharArena {
+    std::vector<char> bytes;
+    size_t used = 0;
+
+    // Appends at most 255 characters of `src` and a NUL; returns the offset
+    // of the copy and stores its length in `length`.
+    uint32_t append(const char *src, uint32_t &length) {
+        const size_t n = src != nullptr ? strnlen(src, kTextLimit) : 0;
+        if (bytes.size() - used < n + 1) {
+            bytes.resize(std::max(bytes.size() * 2, used + n + 1));
+        }
+        char *at = bytes.data() + used;
+        if (n != 0) {
+            std::memcpy(at, src, n);
+        }
+        at[n] = '\0';
+        const size_t offset = used;
+        used += n + 1;
+        length = static_cast<uint32_t>(n);
+        return static_cast<uint32_t>(offset);
+    }
+    const char *at(uint32_t offset) const { return bytes.data() + offset; }
+};
+
 struct Recorder {
-    std::vector<char> decodedChars;
+    CharArena decodedChars;
     std::vector<DecodedEntry> decoded;
-    std::vector<HostSpan> spans;
-    std::vector<char> displayChars;
+    std::vector<HostSpan> spans; // grows only; spansUsed are in use
+    size_t spansUsed = 0;
+    CharArena displayChars;
     std::vector<DisplayEntry> display;
     // host_Decoded / host_Display results: a deque, so the ones handed out
     // stay where they are while more are made.
@@ -71,24 +99,15 @@ struct Recorder {
     uint32_t createLayerCalls = 0;
 
     Recorder() {
-        decodedChars.reserve(1 << 16);
+        decodedChars.bytes.resize(1 << 16);
         decoded.reserve(4096);
-        spans.reserve(16384);
-        displayChars.reserve(1 << 15);
+        spans.resize(16384);
+        displayChars.bytes.resize(1 << 15);
         display.reserve(4096);
     }
 };
 
 Recorder g_recorder;
-
-// Appends at most 255 characters of `src` and a NUL to `arena`; returns the
-// length appended (without the NUL).
-uint32_t appendText(std::vector<char> &arena, const char *src) {
-    const size_t n = src != nullptr ? strnlen(src, kTextLimit) : 0;
-    arena.insert(arena.end(), src, src + n);
-    arena.push_back('\0');
-    return static_cast<uint32_t>(n);
-}
 
 void copyText(char (&dst)[kTextBufferBytes], const char *src, uint32_t n) {
     std::memcpy(dst, src, n);
@@ -217,10 +236,8 @@ int32_t pu_AddDecodedFieldsData(PreDecodeRequest *request, uint32_t spanCount,
                                 uint32_t zero2) {
     Recorder &r = g_recorder;
     DecodedEntry e{};
-    e.text = static_cast<uint32_t>(r.decodedChars.size());
-    e.textLength = appendText(r.decodedChars, text);
-    e.label = static_cast<uint32_t>(r.decodedChars.size());
-    e.labelLength = appendText(r.decodedChars, label);
+    e.text = r.decodedChars.append(text, e.textLength);
+    e.label = r.decodedChars.append(label, e.labelLength);
     e.fieldId = fieldId;
     e.selector = spanSelector;
     e.arg8 = zero1;
@@ -229,10 +246,15 @@ int32_t pu_AddDecodedFieldsData(PreDecodeRequest *request, uint32_t spanCount,
         const size_t line = size_t{request->currentLineIndex} * DPX_OUTPUT_LINE_SIZE;
         e.lineLayerCode = static_cast<uint8_t>(request->outputLines[line]);
     }
-    e.firstSpan = static_cast<uint32_t>(r.spans.size());
+    e.firstSpan = static_cast<uint32_t>(r.spansUsed);
     e.spanCount = spans != nullptr ? spanCount : 0;
+    if (r.spans.size() - r.spansUsed < e.spanCount) {
+        r.spans.resize(std::max(r.spans.size() * 2, r.spansUsed + e.spanCount));
+    }
+    r.spansUsed += e.spanCount;
+    HostSpan *to = r.spans.data() + e.firstSpan;
     for (uint32_t i = 0; i < e.spanCount; ++i) {
-        r.spans.push_back(HostSpan{spans[i].value, spans[i].firstBit, spans[i].lastBit});
+        to[i] = HostSpan{spans[i].value, spans[i].firstBit, spans[i].lastBit};
     }
     r.decoded.push_back(e);
     return 1;
@@ -242,8 +264,7 @@ int32_t pu_AddFieldsToDisplayData(PreDecodeRequest * /*request*/, char *text,
                                   uint32_t displayId) {
     Recorder &r = g_recorder;
     DisplayEntry e{};
-    e.text = static_cast<uint32_t>(r.displayChars.size());
-    e.textLength = appendText(r.displayChars, text);
+    e.text = r.displayChars.append(text, e.textLength);
     e.displayId = displayId;
     r.display.push_back(e);
     return 1;
@@ -373,15 +394,15 @@ void host_FreeRequest(PreDecodeRequest *request) {
 
 void host_ClearDecodedRecords(void) {
     Recorder &r = g_recorder;
-    r.decodedChars.clear();
+    r.decodedChars.used = 0;
     r.decoded.clear();
-    r.spans.clear();
+    r.spansUsed = 0;
     r.decodedCopies.clear();
 }
 
 void host_ClearDisplayRecords(void) {
     Recorder &r = g_recorder;
-    r.displayChars.clear();
+    r.displayChars.used = 0;
     r.display.clear();
     r.displayCopies.clear();
 }
@@ -400,9 +421,9 @@ int host_DecodedView(uint32_t index, HostFieldView *out) {
         return 0;
     }
     const DecodedEntry &e = r.decoded[index];
-    out->text = r.decodedChars.data() + e.text;
+    out->text = r.decodedChars.at(e.text);
     out->textLength = e.textLength;
-    out->label = r.decodedChars.data() + e.label;
+    out->label = r.decodedChars.at(e.label);
     out->labelLength = e.labelLength;
     out->fieldId = e.fieldId;
     out->selector = e.selector;
@@ -447,7 +468,7 @@ int host_DisplayView(uint32_t index, HostDisplayView *out) {
         return 0;
     }
     const DisplayEntry &e = r.display[index];
-    out->text = r.displayChars.data() + e.text;
+    out->text = r.displayChars.at(e.text);
     out->textLength = e.textLength;
     out->displayId = e.displayId;
     return 1;
@@ -461,7 +482,7 @@ const HostDisplayField *host_Display(uint32_t index) {
     while (r.displayCopies.size() <= index) {
         const DisplayEntry &e = r.display[r.displayCopies.size()];
         HostDisplayField &f = r.displayCopies.emplace_back();
-        copyText(f.text, r.displayChars.data() + e.text, e.textLength);
+        copyText(f.text, r.displayChars.at(e.text), e.textLength);
         f.displayId = e.displayId;
     }
     return &r.displayCopies[index];
