@@ -156,7 +156,8 @@ void finish(benchmark::State &state, const Corpus &c, int64_t failed, double fie
     state.SetLabel(c.source);
     state.counters["messages"] = messages;
     state.counters["failed"] = static_cast<double>(failed);
-    state.counters["fields/message"] = messages > 0 ? fields / messages : 0.0;
+    if (fields > 0)
+        state.counters["fields/message"] = fields / messages;
     // After the warm-up sweep the host's arrays are large enough: a pass
     // should grow nothing.
     state.counters["reallocs/message"] = calls > 0 ? host_ReallocCalls() / calls : 0.0;
