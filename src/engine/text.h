@@ -28,14 +28,6 @@ struct TextBuf {
     }
     // A literal's length is known at compile time.
     void append(std::string_view s) { append(s.data(), s.size()); }
-    void blanks(size_t n) {
-        static constexpr char kBlanks[] = "        ";
-        while (n > 0) {
-            const size_t k = n < 8 ? n : 8;
-            append(kBlanks, k);
-            n -= k;
-        }
-    }
     void decimal(uint32_t v) {
         char tmp[12];
         size_t i = sizeof tmp;
