@@ -61,7 +61,7 @@ CAMEL_GPRS_ARGUMENT_(kGprsEventReport, "GPRS Event Report", 2425, 2426, eventTyp
 // ---- Furnish Charging Info GPRS (77): an OCTET STRING holding the billing data ------------------
 
 constexpr Member kFciGprsSequence1[] = {
-    el(0x80, "Free Format Data", 2506, 2507, halfOctets(2188, 52)),
+    el(0x80, "Free Format Data", 2186, 2187, halfOctets(2188, 52)),
     pdpId(0x81),
     appendFreeFormatData(0x82),
 };

@@ -178,10 +178,10 @@ constexpr MemberTable kOSmsFailureMembers = members(Walk::InOrder, kOSmsFailure)
 constexpr Member kTSmsFailure[] = {el(0x80, "MT SMS Cause", 4313, 4314, CAMEL_UNIT(mtSmsCause))};
 constexpr MemberTable kTSmsFailureMembers = members(Walk::InOrder, kTSmsFailure);
 constexpr Member kEventSpecificInfoSms[] = {
-    alt(0xA0, "O. SMS Failure Specific Info", 2173, table(kOSmsFailureMembers)),
-    alt(0xA1, "O. SMS Submitted Specific Info", 2173, none()),
-    alt(0xA2, "T. SMS Failure Specific Info", 2173, table(kTSmsFailureMembers)),
-    alt(0xA3, "T. SMS Delivery Specific Info", 2173, none()),
+    alt(0xA0, "O. SMS Failure Specific Info", 2171, table(kOSmsFailureMembers)),
+    alt(0xA1, "O. SMS Submitted Specific Info", 2171, none()),
+    alt(0xA2, "T. SMS Failure Specific Info", 2171, table(kTSmsFailureMembers)),
+    alt(0xA3, "T. SMS Delivery Specific Info", 2171, none()),
 };
 constexpr MemberTable kEventSpecificInfoSmsChoice =
     members(Walk::Choice, kEventSpecificInfoSms, 2172);

@@ -193,9 +193,9 @@ constexpr Member kLegOrCallSegment[] = {
 };
 constexpr MemberTable kLegOrCallSegmentChoice = members(Walk::Choice, kLegOrCallSegment, 4188);
 constexpr Member kContinueWithArgumentArgExtensionRows[] = {
-    null(0x80, "suppress_D_CSI", 4182, 4183),
-    null(0x81, "suppress_N_CSI", 4184, 4185),
-    null(0x82, "suppressOutgoingCallBarring", 4211, 4212),
+    null(0x80, "suppress_D_CSI", 4182, 1535),
+    null(0x81, "suppress_N_CSI", 4184, 1535),
+    null(0x82, "suppressOutgoingCallBarring", 4211, 1535),
     el(0xA3, "Leg Or Call Segment", 4186, 4187, table(kLegOrCallSegmentChoice)),
 };
 constexpr MemberTable kContinueWithArgumentArgExtension =
@@ -281,7 +281,7 @@ struct ChargeIndicatorBits {
 constexpr Member kAnswerRows[] = {
     calledPartyNumber(0x9F32),
     null(0x9F33, "Or Call", 1575, 1576),
-    null(0x9F34, "Forwarded Call", 1577, 1578),
+    null(0x9F34, "Forwarded Call", 1577, 2606),
     el(0x9F35, "Charge Indicator", 4280, 4281, unitOf<ChargeIndicatorBits>()),
     extBasicServiceCode(0xBF36),
     extBasicServiceCode(0xBF37),
@@ -306,10 +306,10 @@ constexpr MemberTable kNoAnswer = members(Walk::InOrder, kNoAnswerRows);
 
 // Location information as a plain octet string.
 constexpr Member kLocationRows[] = {
-    el(0xBF32, "Location Information", 1581, 1582, halfOctets(1583, 255))};
+    el(0xBF32, "Location Information", 1581, 2032, halfOctets(1583, 255))};
 constexpr MemberTable kLocation = members(Walk::InOrder, kLocationRows);
 
-constexpr Member kAbandonRows[] = {null(0x9F32, "routeNotPermitted", 1584, 1585)};
+constexpr Member kAbandonRows[] = {null(0x9F32, "routeNotPermitted", 1584, 2606)};
 constexpr MemberTable kAbandon = members(Walk::InOrder, kAbandonRows);
 
 

@@ -111,7 +111,7 @@ constexpr uint32_t valueCountOf(const FieldDef &f) {
         return 2;
     if (f.render != Render::Enum)
         return 0;
-    return f.nameCount + (f.otherName[0] != '\0' ? 1u : 0u);
+    return f.nameCount + (f.othersNamed ? 1u : 0u);
 }
 constexpr ValueSource valueOf(const FieldDef &f, uint32_t k) {
     if (f.render == Render::LenBlock)

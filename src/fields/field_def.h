@@ -49,6 +49,9 @@ struct FieldDef {
     // The name of a value that neither table lists ("Reserved" in some
     // tables); empty by default.
     const char *otherName = "";
+    // The value table has an entry for every other value, naming it
+    // otherName (which may be the empty text).
+    bool othersNamed = false;
     // Text that follows the value in the decoded-field text ("h" after a
     // value shown in hexadecimal); the display pass shows the value alone.
     const char *suffix = "";
@@ -84,6 +87,7 @@ struct FieldDef {
     constexpr FieldDef otherwise(const char *name) const {
         FieldDef f = *this;
         f.otherName = name;
+        f.othersNamed = true;
         return f;
     }
     // A field the display pass reports under another field's display id
