@@ -21,12 +21,11 @@ It also decodes malformed variants (capgen mutate) with all four passes and
 checks that every pass returns 1, that every reported bit span lies inside
 the message and that the decoder does not crash.
 
-The call-control arguments (call_control.py beside this script), the
-charging, call gap and announcement arguments, results and errors
-(charging.py), the SMS arguments (sms.py) and the GPRS operations' arguments
-(gprs.py) are checked value by value against tshark on messages with random
-values, and every octet of each argument, result or error must lie in a
-reported field of a clean four-pass decode.
+The arguments, results and errors of the areas in areas.py (call control;
+charging, call gap and announcements; SMS; GPRS) are checked value by value
+against tshark on messages with random values, and every octet of each
+argument, result or error must lie in a reported field of a clean four-pass
+decode (arguments.py).
 
 Exit status: 0 all agree, 1 disagreements or a crash, 77 skipped (the
 reference tools or tshark are missing).  Python 3 standard library only.
@@ -42,6 +41,11 @@ import sys
 import tempfile
 import time
 from pathlib import Path
+
+sys.dont_write_bytecode = True     # leave the source and shared tools folders as they are
+sys.path.insert(0, str(Path(__file__).resolve().parent))
+import arguments  # noqa: E402
+import areas  # noqa: E402
 
 SKIP = 77
 MSG_TYPES = ('begin', 'continue', 'end', 'abort', 'unidirectional')
@@ -63,9 +67,6 @@ F_INVOKE_ID, F_LINKED_ID = 3705, 3708
 F_OPCODE, F_RESULT_OPCODE, F_ERROR_CODE = 1066, 1068, 1070
 F_PROBLEM_TYPE = 3701
 
-# The result's operation code and the error code are compared (both are
-# decoded after the invoke id of their component).
-RESULT_AND_ERROR_CODES_DECODED = True
 PROBLEM_CODE_FIELDS = {3710: 0x80, 3712: 0x81, 3714: 0x82, 3716: 0x83}
 
 COMPONENT_BY_FIELD = {F_INVOKE: 'invoke', F_RESULT_LAST: 'returnResultLast',
@@ -400,9 +401,9 @@ def component_expectations(cp, ora_comps, e, notes):
             if oc.get('opcode') not in NAMED_OPCODES:
                 notes.add('opcode-unnamed')
         elif ctype == 'returnResultLast':
-            c['opcode'] = oc.get('opcode') if RESULT_AND_ERROR_CODES_DECODED else None
+            c['opcode'] = oc.get('opcode')
         elif ctype == 'returnError':
-            c['error_code'] = oc.get('error_code') if RESULT_AND_ERROR_CODES_DECODED else None
+            c['error_code'] = oc.get('error_code')
         else:
             if oc.get('invoke_id') is None:
                 notes.add('reject-null-invoke-id')
@@ -429,20 +430,6 @@ SCALARS = ('type', 'otid', 'dtid', 'p_abort', 'dialogue', 'acn', 'result', 'abor
 COMPONENT_KEYS = ('type', 'invoke_id', 'linked_id', 'opcode', 'error_code', 'problem')
 
 
-class Stats:
-    def __init__(self):
-        self.compared = {}
-        self.agreed = {}
-        self.rules = {}           # rule -> [count, example hex]
-        self.failures = []        # (index, group, what, hex)
-        self.flags = {}           # error flags of messages no rule adjusts -> [count, hex]
-
-    def count(self, key, ok):
-        self.compared[key] = self.compared.get(key, 0) + 1
-        if ok:
-            self.agreed[key] = self.agreed.get(key, 0) + 1
-
-
 def compare(index, group, hexmsg, ora, ours, stats):
     data = bytes.fromhex(hexmsg)
     notes = set()
@@ -456,8 +443,7 @@ def compare(index, group, hexmsg, ora, ours, stats):
         stats.failures.append((index, group, 'reference: %s' % exc, hexmsg))
         return
     for n in notes:
-        r = stats.rules.setdefault(n, [0, hexmsg])
-        r[0] += 1
+        stats.rule(n, hexmsg)
     if not notes:
         fl = stats.flags.setdefault(ours.get('errorFlags'), [0, hexmsg])
         fl[0] += 1
@@ -558,7 +544,7 @@ def check_mutated(mutated, outputs, stats):
                 # A key value that does not fit its slot ends the key-field
                 # pass with 0: that is the pass's answer, not a fault.
                 ok = True
-                stats.rules.setdefault('key-overflow', [0, hexmsg])[0] += 1
+                stats.rule('key-overflow', hexmsg)
             stats.count('mutated: %s result 1' % p, ok)
             if not ok:
                 stats.failures.append(('m%d' % i, 'mutated ' + why, '%s pass result %r' % (p, r), hexmsg))
@@ -575,8 +561,7 @@ def check_mutated(mutated, outputs, stats):
 
 
 def main(argv=None):
-    here = Path(__file__).resolve().parent
-    repo = here.parent.parent
+    repo = Path(__file__).resolve().parent.parent.parent
     ap = argparse.ArgumentParser(description=__doc__.split('\n')[0])
     ap.add_argument('--decoder', default=str(repo / 'build' / 'native' / 'dpx-decode'),
                     help='dpx-decode executable')
@@ -609,101 +594,95 @@ def main(argv=None):
         return 1
     decoder = [args.emulator, args.decoder] if args.emulator else [args.decoder]
     sys.path.insert(0, str(tools))
-    sys.dont_write_bytecode = True     # leave the shared tools folder as it is
     import capgen  # noqa: E402 (found only at run time)
-    sys.path.insert(0, str(here))
-    import call_control  # noqa: E402
-    import charging  # noqa: E402
-    import sms  # noqa: E402
-    import gprs  # noqa: E402
+    arguments.init(capgen)
 
     started = time.time()
     corpus = build_corpus(capgen, args.per_group, args.seed)
     mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
-    # The argument suites: (name, module, corpus); each module builds its
-    # corpus, checks tshark's and our outputs and reports.
-    suites = [(name, module, module.build_corpus(args.per_op, args.seed))
-              for name, module in (('call control', call_control), ('charging', charging),
-                                   ('sms', sms),
-                                   ('gprs', gprs))]
+    # The argument areas and their messages, decoded in one run of each decoder
+    suites = []
+    for area in areas.AREAS:
+        area.update(types=areas.TYPES, rows=arguments.read_rows(areas.VALUES, area['letter']),
+                    rules=area['rules'].split())
+        suites.append((area, arguments.build_corpus(area, args.per_op, args.seed)))
+    arg_corpus = [m for _, c in suites for m in c]
 
     work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     work.mkdir(parents=True, exist_ok=True)
     try:
-        src, msrc = work / 'corpus.txt', work / 'mutated.txt'
-        write_hex(src, corpus)
-        write_hex(msrc, mutated)
-        ora_out, our_out, mut_out = work / 'oracle.jsonl', work / 'ours.jsonl', work / 'mutated.jsonl'
-        jobs = {
-            'oracle.py': [sys.executable, str(tools / 'oracle.py'), str(src), '--jsonl', '-q',
-                          '--no-hex', '--tshark', args.tshark, '-o', str(ora_out)],
-            'dpx-decode (corpus)': decoder + ['--format', 'json', '--pass', 'md', str(src)],
-            'dpx-decode (mutated)': decoder + ['--format', 'json',
-                                               '--pass', 'md,display,view,keys', str(msrc)],
-        }
-        outs = {'dpx-decode (corpus)': our_out, 'dpx-decode (mutated)': mut_out}
-        files = {}
-        for name, _, suite_corpus in suites:
-            stem = work / name.replace(' ', '_')
-            f = files[name] = {k: Path('%s.%s' % (stem, k))
-                               for k in ('txt', 'oracle.jsonl', 'pdml', 'ours.jsonl')}
-            write_hex(f['txt'], suite_corpus)
-            jobs['oracle.py (%s)' % name] = [
-                sys.executable, str(tools / 'oracle.py'), str(f['txt']), '--jsonl', '-q',
-                '--no-hex', '--tshark', args.tshark, '-o', str(f['oracle.jsonl']),
-                '--pdml', str(f['pdml'])]
-            jobs['dpx-decode (%s)' % name] = decoder + [
-                '--format', 'json', '--pass', 'md,display,view,keys', str(f['txt'])]
-            outs['dpx-decode (%s)' % name] = f['ours.jsonl']
-        procs = {}
-        for name, cmd in jobs.items():
-            stdout = open(outs[name], 'w') if name in outs else subprocess.DEVNULL
-            procs[name] = (subprocess.Popen(cmd, stdout=stdout, stderr=subprocess.PIPE,
-                                            text=True), stdout)
+        # the reference reads each area's messages in a process of its own
+        parts = [area['name'].replace(' ', '_') + '.' for area, _ in suites]
+        f = {k: work / k for k in ['corpus.txt', 'mutated.txt', 'oracle.jsonl', 'ours.jsonl',
+                                   'mutated.jsonl', 'arguments.ours.jsonl'] +
+             [a + k for a in parts for k in ('txt', 'oracle.jsonl', 'pdml')]}
+        for name, msgs in [('corpus.txt', corpus), ('mutated.txt', mutated)] + \
+                [(a + 'txt', c) for a, (_, c) in zip(parts, suites)]:
+            write_hex(f[name], msgs)
+        reference = [sys.executable, str(tools / 'oracle.py'), '--jsonl', '-q', '--no-hex',
+                     '--tshark', args.tshark]
+        json_out = decoder + ['--format', 'json', '--pass']
+        jobs = [  # command, file taking its standard output
+            (reference + [str(f['corpus.txt']), '-o', str(f['oracle.jsonl'])], None),
+            (json_out + ['md', str(f['corpus.txt'])], f['ours.jsonl']),
+            (json_out + ['md,display,view,keys', str(f['mutated.txt'])], f['mutated.jsonl']),
+            (json_out + ['md,display,view,keys'] + [str(f[a + 'txt']) for a in parts],
+             f['arguments.ours.jsonl'])] + [
+            (reference + [str(f[a + 'txt']), '-o', str(f[a + 'oracle.jsonl']),
+                          '--pdml', str(f[a + 'pdml'])], None) for a in parts]
+        procs = [(cmd, open(out, 'w') if out else subprocess.DEVNULL) for cmd, out in jobs]
+        procs = [(cmd, subprocess.Popen(cmd, stdout=out, stderr=subprocess.PIPE, text=True), out)
+                 for cmd, out in procs]
         crashed = []
-        for name, (p, stdout) in procs.items():
+        for cmd, p, out in procs:
             _, err = p.communicate()
-            if stdout is not subprocess.DEVNULL:
-                stdout.close()
+            if out is not subprocess.DEVNULL:
+                out.close()
             if p.returncode != 0:
-                crashed.append('%s exited with %d%s' % (name, p.returncode,
+                crashed.append('%s exited with %d%s' % (' '.join(cmd), p.returncode,
                                                         (':\n' + err.strip()[-3000:]) if err else ''))
         if crashed:
             print('FAILED:\n' + '\n'.join(crashed))
             return 1
-
-        oracle, ours, mut = read_jsonl(ora_out), read_jsonl(our_out), read_jsonl(mut_out)
-        stats = Stats()
-        if len(oracle) != len(corpus) or len(ours) != len(corpus) or len(mut) != len(mutated):
-            print('FAILED: output counts: oracle %d, ours %d of %d; mutated %d of %d'
-                  % (len(oracle), len(ours), len(corpus), len(mut), len(mutated)))
+        oracle, ours, mut = (read_jsonl(f[k]) for k in ('oracle.jsonl', 'ours.jsonl',
+                                                        'mutated.jsonl'))
+        arg_outputs = ([x for a in parts for x in arguments.read_pdml(f[a + 'pdml'])],
+                       [x for a in parts for x in read_jsonl(f[a + 'oracle.jsonl'])],
+                       read_jsonl(f['arguments.ours.jsonl']))
+        counts = [len(oracle), len(ours), len(mut)] + [len(x) for x in arg_outputs]
+        if counts != [len(corpus)] * 2 + [len(mutated)] + [len(arg_corpus)] * 3:
+            print('FAILED: output counts (oracle, ours, mutated, tshark, oracle and ours of the '
+                  'arguments): %s of %d, %d, %d' % (counts, len(corpus), len(mutated),
+                                                    len(arg_corpus)))
             return 1
-        for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
-            compare(i, group, hexmsg, o, u.get('md') or {}, stats)
-        check_mutated(mutated, mut, stats)
-        suite_stats = []
-        for name, module, suite_corpus in suites:
-            f = files[name]
-            outputs = (call_control.read_pdml(f['pdml']), read_jsonl(f['oracle.jsonl']),
-                       read_jsonl(f['ours.jsonl']))
-            if any(len(x) != len(suite_corpus) for x in outputs):
-                print('FAILED: %s output counts: tshark %d, oracle %d, ours %d of %d'
-                      % tuple([name] + [len(x) for x in outputs] + [len(suite_corpus)]))
-                return 1
-            suite_stats.append(module.check(suite_corpus, *outputs, parse_node, tcap_rules))
     finally:
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
+    stats = arguments.Stats()
+    stats.flags = {}        # error flags of messages no rule adjusts -> [count, hex]
+    for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
+        compare(i, group, hexmsg, o, u.get('md') or {}, stats)
+    check_mutated(mutated, mut, stats)
+    suite_stats, first = [], 0
+    for area, suite_corpus in suites:
+        part = [x[first:first + len(suite_corpus)] for x in arg_outputs]
+        first += len(suite_corpus)
+        suite_stats.append(arguments.check(area, suite_corpus, *part, parse_node, tcap_rules))
 
+    if args.per_group >= 1000:      # large enough that every rule must have been needed
+        stats.failures += [('-', 'rules', 'RULE NEVER APPLIED %s: no message needed it' % r, '')
+                           for r in RULE_TEXT if r not in stats.rules and r != 'key-overflow']
     report(stats, len(corpus), len(mutated), time.time() - started, args.show)
     bad = 0
-    for (name, module, suite_corpus), suite in zip(suites, suite_stats):
-        lines, suite_bad = module.report(suite, args.show, args.per_op >= 200)
-        print('%d %s messages (%s) compared with tshark and decoded with all passes'
-              % (len(suite_corpus), name, module.CONTENTS))
+    for (area, suite_corpus), suite in zip(suites, suite_stats):
+        lines, suite_bad = arguments.report(area, suite, args.show, args.per_op >= 200,
+                                            areas.RULE_TEXT)
+        print('%d %s messages (%d operations%s) compared with tshark and decoded with all passes'
+              % (len(suite_corpus), area['name'], len(area['ops']), ', %d result operation '
+                 'codes, every error code' % len(area['results']) if 'results' in area else ''))
         print('\n'.join(lines))
-        print('PASSED (%s)' % name if not suite_bad else
-              'FAILED (%s): %d disagreements' % (name, suite_bad))
+        print('PASSED (%s)' % area['name'] if not suite_bad else
+              'FAILED (%s): %d disagreements' % (area['name'], suite_bad))
         bad += suite_bad
     return 1 if stats.failures or bad else 0
 
@@ -713,7 +692,7 @@ def report(stats, n, n_mut, seconds, show):
           'messages decoded with all passes, %.1f s' % (n, n_mut, seconds))
     print('agreement (values compared where tshark or our rules give one):')
     for key in sorted(stats.compared):
-        c, a = stats.compared[key], stats.agreed.get(key, 0)
+        c, a = stats.compared[key]
         print('  %-34s %6d / %-6d%s' % (key, a, c, '' if a == c else '  <-- %d differ' % (c - a)))
     if stats.rules:
         print('rule-aware adjustments (our rules, tshark differs; messages, example):')

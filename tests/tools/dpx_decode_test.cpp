@@ -302,10 +302,13 @@ TEST(DpxDecodeRun, ModuleThatCannotBeLoadedExitsWithTwo) {
     for (const auto &[module, error] : std::vector<std::pair<std::string, std::string>>{
              {::testing::TempDir() + "no-such-module.so", "cannot load module"},
              {DPX_BUILD_DIR "/libkf_OptSupport.so", "dpx_PreDecodeMD"}}) {
-        const Outcome r = run("--module " + quote(module) + " --hex 6206480401020304");
-        EXPECT_EQ(r.status, 2) << module;
-        EXPECT_EQ(r.out, "");
-        EXPECT_NE(r.err.find(error), std::string::npos) << r.err;
+        // The module is loaded once, before any worker starts.
+        for (const char *jobs : {"--jobs 1", "--jobs 4"}) {
+            const Outcome r = run(std::string(jobs) + " --module " + quote(module) + " --hex 6206480401020304");
+            EXPECT_EQ(r.status, 2) << module;
+            EXPECT_EQ(r.out, "");
+            EXPECT_NE(r.err.find(error), std::string::npos) << r.err;
+        }
     }
 }
 
