@@ -1,23 +1,26 @@
 #!/usr/bin/env python3
 """dpx-decode against tshark on one capture of CAMEL traffic.
 
-Writes a capture of --messages CAMEL messages (default 100,000): overlapping
-call flows (tools/capwrite/callflow.py: InitialDP, RequestReportBCSMEvent,
-ApplyCharging, Continue, EventReportBCSM, ApplyChargingReport, ReleaseCall,
-SMS, announcements with their Return Results, Return Errors, rejects,
-aborts) over Ethernet/IPv4/SCTP/M3UA/SCCP, a few messages bundled or
-fragmented, and times, on the same file, side by side:
+Writes a capture of --messages CAMEL messages (default 100,000) of every
+operation, with their results, errors, rejects and aborts, in all five
+message types (capgen.py's random corpus, valid messages only) over
+Ethernet/IPv4/SCTP/M3UA/SCCP, a few messages bundled or fragmented, and
+times, on the same file, side by side:
 
     dpx-decode --pass md        against  tshark -V
-    dpx-decode --pass keys      against  tshark -T fields (frame, otid, dtid, invoke id, opcode)
+    dpx-decode --pass keys      against  tshark -T fields (otid, dtid, opcode,
+                                         service key, calling digits, IMSI)
     dpx-decode --summary        against  tshark (one line per frame)
 
-Output goes to /dev/null on both sides.  Prints wall time, messages per
-second, CPU time (user + system: steadier than wall time on a busy
+dpx-decode runs with --jobs 1 and with --jobs at every core.  Each command
+runs three times, the three sides of a comparison in turn, and the best time
+of each is kept.  Output goes to /dev/null on both sides.  Prints wall time,
+CPU time (user + system, workers included: steadier than wall time on a busy
 machine), the ratios (tshark / dpx-decode) and the peak resident memory of
-each process; then dpx-decode's peak memory on a capture a tenth
-the size, to show it does not grow with the capture.  The capture is kept
-in --workdir and reused while its parameters stay the same.
+each side (the largest single process: the reading process or one of the
+workers); then dpx-decode's peak memory on a capture a tenth the size, to
+show it does not grow with the capture.  The capture is kept in --workdir and
+reused while its parameters stay the same.
 
 Needs tshark and the reference tools (../shared/tools, for capgen.py).
 Python 3 standard library only.
@@ -35,58 +38,64 @@ from pathlib import Path
 ROOT = Path(__file__).resolve().parents[1]
 TSHARK_PREFS = ['camel.tcap.ssn:146', 'tcap.persistentsrt:FALSE', 'camel.persistentsrt:FALSE',
                 'mtp3.standard:ITU', 'gui.max_tree_depth:100000']
-KEY_FIELDS = ['frame.number', 'tcap.otid', 'tcap.dtid', 'camel.present', 'camel.local']
+KEY_FIELDS = ['tcap.otid', 'tcap.dtid', 'camel.local', 'camel.serviceKey', 'e164.calling_party_number.digits',
+              'e212.imsi']
+ROUNDS = 3
+
+
+# The peak memory the kernel reports for a process counts what it held
+# before exec: a command started straight from this (large) Python process
+# would show Python's size.  GNU time, small itself, starts it instead and
+# reports the peak of the command and the processes it waited for.
+GNU_TIME = '/usr/bin/time' if os.access('/usr/bin/time', os.X_OK) else None
 
 
 def run(cmd, env=None):
     """-> (wall seconds, CPU seconds (user + system), peak resident set in
-    MiB, exit status)."""
-    start = time.perf_counter()
-    proc = subprocess.Popen(cmd, stdout=subprocess.DEVNULL, stderr=subprocess.PIPE, env=env)
-    _, status, usage = os.wait4(proc.pid, 0)
-    wall = time.perf_counter() - start
+    MiB of the largest process, exit status)."""
+    with tempfile.NamedTemporaryFile('r', prefix='bench-rss-') as rss:
+        full = [GNU_TIME, '-q', '-f', '%M', '-o', rss.name] + cmd if GNU_TIME else cmd
+        start = time.perf_counter()
+        proc = subprocess.Popen(full, stdout=subprocess.DEVNULL, stderr=subprocess.PIPE, env=env)
+        _, status, usage = os.wait4(proc.pid, 0)
+        wall = time.perf_counter() - start
+        peak = rss.read().strip().splitlines() if GNU_TIME else []
     err = proc.stderr.read().decode(errors='replace')
     proc.stderr.close()
     proc.returncode = os.waitstatus_to_exitcode(status)
     if proc.returncode != 0:
         sys.stderr.write('capture_bench: %s exited %d: %s\n' % (cmd[0], proc.returncode, err.strip()[:300]))
-    return wall, usage.ru_utime + usage.ru_stime, usage.ru_maxrss / 1024.0, proc.returncode
+    kib = int(peak[-1]) if peak and peak[-1].isdigit() else usage.ru_maxrss
+    return wall, usage.ru_utime + usage.ru_stime, kib / 1024.0, proc.returncode
 
 
-def write_flow(path, messages, seed):
+def write_corpus(path, messages, seed):
     sys.path.insert(0, str(ROOT / 'tools' / 'capwrite'))
     import callflow
     c = callflow.load_capgen()
     if c is None:
         sys.exit('capture_bench: capgen.py not found (../shared/tools or DPX_REFERENCE_TOOLS)')
-    # Mostly one message a packet; every 50th message bundled with the next
+    # The two sides take turns; every 50th message is bundled with the next
     # ones or fragmented, as busy links do.
     with open(path, 'w') as out:
-        side = None
-        for i, (s, hexmsg, _desc, _call) in enumerate(
-                callflow.generate(c, seed=seed, messages=messages, overlap=200)):
-            opts = []
-            if s != side:
-                opts.append('--from ' + s)
-                side = s
+        for i, m in enumerate(c.random_corpus(messages, seed=seed, avoid_quirks=True)):
+            opts = ['--from ' + 'ab'[i % 2]]
             if i % 50 == 0:
                 opts.append('--fragment 64')
             elif i % 50 == 1:
                 opts.append('--fragment 0 --bundle 4')
             elif i % 50 == 5:
                 opts.append('--bundle 1')
-            if opts:
-                out.write('#@ %s\n' % ' '.join(opts))
-            out.write(hexmsg + '\n')
+            out.write('#@ %s\n%s\n' % (' '.join(opts), m['hex']))
 
 
 def make_capture(capwrite, workdir, messages, seed):
-    cap = workdir / ('camel-%d-%d.pcap' % (messages, seed))
+    cap = workdir / ('camel-ops-%d-%d.pcap' % (messages, seed))
     if cap.exists():
         return cap
-    flow = workdir / ('camel-%d-%d.hex' % (messages, seed))
+    flow = workdir / ('camel-ops-%d-%d.hex' % (messages, seed))
     t = time.perf_counter()
-    write_flow(flow, messages, seed)
+    write_corpus(flow, messages, seed)
     subprocess.run([capwrite, '-o', str(cap), str(flow)], check=True)
     print('wrote %s (%d messages, %.1f MB) in %.1f s'
           % (cap, messages, cap.stat().st_size / 1e6, time.perf_counter() - t))
@@ -121,26 +130,36 @@ def main(argv=None):
     fields = []
     for f in KEY_FIELDS:
         fields += ['-e', f]
-    pairs = [
-        ('md', [a.decoder, '--pass', 'md', str(cap)], tshark + ['-V']),
-        ('keys', [a.decoder, '--pass', 'keys', str(cap)], tshark + ['-T', 'fields'] + fields),
-        ('summary', [a.decoder, '--summary', str(cap)], tshark),
+    cores = len(os.sched_getaffinity(0))
+    comparisons = [
+        ('md', ['--pass', 'md'], tshark + ['-V']),
+        ('keys', ['--pass', 'keys'], tshark + ['-T', 'fields'] + fields),
+        ('summary', ['--summary'], tshark),
     ]
-    print('\n%d messages in %s (%s)' % (a.messages, cap.name, subprocess.run(
-        [a.tshark, '--version'], capture_output=True, text=True).stdout.splitlines()[0]))
-    print('wall and CPU (user + system) seconds; ratio: tshark / dpx-decode')
-    print('%-8s %15s %15s %13s %12s %10s %10s' % ('pass', 'dpx-decode', 'tshark', 'ratio wall/CPU',
-                                                  'msgs/s ours', 'RSS ours', 'RSS tshark'))
+    print('\n%d messages in %s (%s), %d cores' % (a.messages, cap.name, subprocess.run(
+        [a.tshark, '--version'], capture_output=True, text=True).stdout.splitlines()[0], cores))
+    print('best of %d, interleaved; wall / CPU (user + system) seconds; ratio: tshark / dpx-decode' % ROUNDS)
+    print('%-8s %-9s %15s %15s %15s %12s %10s %10s' % ('pass', 'jobs', 'dpx-decode', 'tshark', 'ratio wall/CPU',
+                                                      'msgs/s ours', 'RSS ours', 'RSS tshark'))
     failed = False
-    for name, ours, theirs in pairs:
+    for name, args, theirs in comparisons:
         if a.only and name not in a.only:
             continue
-        t_ours, c_ours, m_ours, rc1 = run(ours)
-        t_theirs, c_theirs, m_theirs, rc2 = run(theirs, env)
-        failed |= rc1 != 0 or rc2 != 0
-        print('%-8s %7.2f / %6.2f %7.2f / %6.2f %6.1fx/%5.1fx %12.0f %7.1f MB %7.1f MB'
-              % (name, t_ours, c_ours, t_theirs, c_theirs, t_theirs / t_ours,
-                 c_theirs / max(c_ours, 1e-3), a.messages / t_ours, m_ours, m_theirs))
+        sides = [[a.decoder, '--jobs', '1'] + args + [str(cap)],
+                 [a.decoder, '--jobs', str(cores)] + args + [str(cap)], theirs]
+        best = [None] * len(sides)
+        for _ in range(ROUNDS):
+            for k, cmd in enumerate(sides):
+                wall, cpu, rss, rc = run(cmd, env if k == 2 else None)
+                failed |= rc != 0
+                b = best[k] or (wall, cpu, rss)
+                best[k] = (min(b[0], wall), min(b[1], cpu), max(b[2], rss))
+        t_theirs, c_theirs, m_theirs = best[2]
+        for k, jobs in ((0, '1'), (1, '%d (all)' % cores)):
+            t_ours, c_ours, m_ours = best[k]
+            print('%-8s %-9s %7.2f / %6.2f %7.2f / %6.2f %7.1fx/%5.1fx %12.0f %7.1f MB %7.1f MB'
+                  % (name, jobs, t_ours, c_ours, t_theirs, c_theirs, t_theirs / t_ours,
+                     c_theirs / max(c_ours, 1e-3), a.messages / t_ours, m_ours, m_theirs))
     _, _, m_small, rc = run([a.decoder, '--pass', 'md', str(small)])
     _, _, m_big, rc2 = run([a.decoder, '--pass', 'md', str(cap)])
     failed |= rc != 0 or rc2 != 0

@@ -21,6 +21,8 @@
 #include "input/hex_line.h"
 #include "input/input.h"
 #include "module.h"
+#include "parallel/decoder.h"
+#include "parallel/pool.h"
 #include "dialogues/tracker.h"
 #include "filter/match.h"
 #include "views/ek_output.h"
@@ -157,6 +159,13 @@ int main(int argc, char **argv) {
         ->check(CLI::Range(0.001, 1e9));
     app.add_option("--flow", flowFile, "write a call-flow picture (SVG) of the dialogues to this file");
     bool tables = false;
+    const long cores = sysconf(_SC_NPROCESSORS_ONLN);
+    unsigned jobs = unsigned(std::clamp(cores, 1L, long(dpxdecode::parallel::kMaxJobs)));
+    app.add_option("--jobs", jobs,
+                   "processes that decode at once, output still in input order (default: the number of online "
+                   "cores, " + std::to_string(jobs) + " here; at most " +
+                       std::to_string(dpxdecode::parallel::kMaxJobs) + "); 1 decodes in dpx-decode itself")
+        ->check(CLI::Range(1u, dpxdecode::parallel::kMaxJobs));
     app.add_flag("--tables", tables, "print the module's description tables as one JSON object and exit");
 
     // "--stats srt" names what --stats counts; "--stats FILE" is the flag and a file.
@@ -255,27 +264,31 @@ int main(int argc, char **argv) {
     run.md |= summary || stats || ek || follow || !filter.empty();
     run.keys |= ek || follow || !filter.empty();
 
-    dpxdecode::TimeFormatter time(timeFormat == "epoch"      ? dpxdecode::TimeFormat::Epoch
-                                  : timeFormat == "relative" ? dpxdecode::TimeFormat::Relative
-                                                             : dpxdecode::TimeFormat::Utc,
-                                  module.dateConv);
-    const dpxdecode::TextOptions textOptions{spans,
-                                             fieldsMode == "all"    ? dpxdecode::FieldsMode::All
-                                             : fieldsMode == "list" ? dpxdecode::FieldsMode::List
-                                                                    : dpxdecode::FieldsMode::Values,
-                                             &time};
-    uint64_t index = 0;
-    dpxdecode::Session session(module);
-    if (!session.ok()) {
+    dpxdecode::parallel::DecodeSettings settings;
+    settings.run = run;
+    settings.showMd = showMd;
+    settings.showKeys = showKeys;
+    settings.passOutput = passOutput;
+    settings.summary = summary;
+    settings.stats = stats;
+    settings.ek = ek;
+    settings.json = json;
+    settings.follow = follow;
+    settings.spans = spans;
+    settings.fields = fieldsMode == "all"    ? dpxdecode::FieldsMode::All
+                      : fieldsMode == "list" ? dpxdecode::FieldsMode::List
+                                             : dpxdecode::FieldsMode::Values;
+    settings.time = timeFormat == "epoch"      ? dpxdecode::TimeFormat::Epoch
+                    : timeFormat == "relative" ? dpxdecode::TimeFormat::Relative
+                                               : dpxdecode::TimeFormat::Utc;
+    settings.filter = &filter;
+    dpxdecode::parallel::MessageDecoder decoder(module, settings);
+    if (!decoder.ok()) {
         std::cerr << "dpx-decode: out of memory preparing the decoding state\n";
         return kExitBadInput;
     }
-    dpxdecode::MessageResult result;
-    std::optional<dpxdecode::MdOut> hiddenMd;
-    std::optional<dpxdecode::KeysOut> hiddenKeys;
-    dpxdecode::MessageSummary messageSummary;
+    uint64_t index = 0;
     dpxdecode::Statistics statistics;
-    dpxdecode::dialogues::MessageFacts facts;
     dpxdecode::views::ResponseTimes responseTimes;
     dpxdecode::views::FlowPicture flow;
     dpxdecode::dialogues::TrackerLimits limits;
@@ -294,53 +307,25 @@ int main(int argc, char **argv) {
         if (flowOut.is_open())
             flow.add(d);
     });
+    const dpxdecode::parallel::OrderedSinks sinks{std::cout, follow ? &tracker : nullptr,
+                                                  stats ? &statistics : nullptr, !filter.empty()};
+    std::optional<dpxdecode::parallel::WorkerPool> pool;
+    if (jobs > 1)
+        pool.emplace(module, settings, decoder, sinks, jobs);
 
     const dpxdecode::InputReport report = dpxdecode::readMessages(
         hexArgs, files, inputOptions,
         [&](const dpxdecode::InputMessage &msg) {
-            session.run(msg.bytes.data(), msg.bytes.size(), run, result);
-            bool selected = true;
-            if (follow || !filter.empty()) {
-                dpxdecode::dialogues::extractFacts(index, msg.bytes.data(), msg.bytes.size(), result, msg.capture,
-                                                   facts);
-                selected = filter.matches(facts, result.md ? &*result.md : nullptr);
-                if (follow)
-                    tracker.add(facts, selected && !filter.empty());
-            }
-            if (!selected) {
-                ++index;
+            if (pool) {
+                pool->add(msg, index++);
                 return;
             }
-            if (summary || stats || ek) {
-                dpxdecode::summarize(*result.md, messageSummary);
-                if (ek)
-                    dpxdecode::writeEk(std::cout, msg, index, dpxdecode::toHex(msg.bytes), result, messageSummary,
-                                       time);
-                if (stats)
-                    statistics.add(messageSummary);
-                if (summary)
-                    dpxdecode::writeSummary(std::cout, index, msg.capture, messageSummary, time, json);
-            }
-            if (passOutput) {
-                // The decoded fields made only for the summary or the
-                // statistics are set aside while the message is written.
-                if (!showMd)
-                    hiddenMd.swap(result.md);
-                if (!showKeys)
-                    hiddenKeys.swap(result.keys);
-                const std::string hex = dpxdecode::toHex(msg.bytes);
-                if (json)
-                    dpxdecode::writeJson(std::cout, index, hex, result, msg.capture);
-                else
-                    dpxdecode::writeText(std::cout, index, hex, result, textOptions, msg.capture);
-                if (!showMd)
-                    hiddenMd.swap(result.md);
-                if (!showKeys)
-                    hiddenKeys.swap(result.keys);
-            }
-            ++index;
+            decoder.decode(msg, index++, true);
+            sinks.take(decoder.facts(), decoder.selected(), decoder.summary(), decoder.text());
         },
         std::cerr);
+    if (pool)
+        pool->finish();
 
     if (follow)
         tracker.finish();
