@@ -7,9 +7,11 @@
 
 #include "host_export.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <deque>
 #include <vector>
 
 namespace {
@@ -41,33 +43,74 @@ uint32_t g_reallocFailAt = 0;
 uint8_t g_accessPointNameResult = 1;
 
 // ---- recorder ----------------------------------------------------------------
+//
+// Each kind of record appends its texts to one character arena and its
+// spans to one pool, so recording a field costs two bounded copies and no
+// allocation once the arenas have grown to a message's size.  The fixed-size
+// HostDecodedField / HostDisplayField copies are made only when asked for.
 
-struct DecodedRecord {
-    HostDecodedField field;
-    size_t firstSpan; // index into Recorder::spans
+struct DecodedEntry {
+    uint32_t text, textLength, label, labelLength; // offsets into Recorder::decodedChars
+    uint32_t fieldId, selector, firstSpan, spanCount, arg8, arg9;
+    uint8_t lineLayerCode;
+};
+
+struct DisplayEntry {
+    uint32_t text, textLength, displayId; // offset into Recorder::displayChars
+};
+
+// Texts one after the other, each NUL-terminated; only grows, so that
+// recording costs one length scan and one copy per text.
+struct CharArena {
+    std::vector<char> bytes;
+    size_t used = 0;
+
+    // Appends at most 255 characters of `src` and a NUL; returns the offset
+    // of the copy and stores its length in `length`.
+    uint32_t append(const char *src, uint32_t &length) {
+        const size_t n = src != nullptr ? strnlen(src, kTextLimit) : 0;
+        if (bytes.size() - used < n + 1) {
+            bytes.resize(std::max(bytes.size() * 2, used + n + 1));
+        }
+        char *at = bytes.data() + used;
+        if (n != 0) {
+            std::memcpy(at, src, n);
+        }
+        at[n] = '\0';
+        const size_t offset = used;
+        used += n + 1;
+        length = static_cast<uint32_t>(n);
+        return static_cast<uint32_t>(offset);
+    }
+    const char *at(uint32_t offset) const { return bytes.data() + offset; }
 };
 
 struct Recorder {
-    std::vector<DecodedRecord> decoded;
-    std::vector<HostSpan> spans;
-    std::vector<HostDisplayField> display;
+    CharArena decodedChars;
+    std::vector<DecodedEntry> decoded;
+    std::vector<HostSpan> spans; // grows only; spansUsed are in use
+    size_t spansUsed = 0;
+    CharArena displayChars;
+    std::vector<DisplayEntry> display;
+    // host_Decoded / host_Display results: a deque, so the ones handed out
+    // stay where they are while more are made.
+    std::deque<HostDecodedField> decodedCopies;
+    std::deque<HostDisplayField> displayCopies;
     uint32_t createLayerCalls = 0;
 
     Recorder() {
+        decodedChars.bytes.resize(1 << 16);
         decoded.reserve(4096);
-        spans.reserve(16384);
+        spans.resize(16384);
+        displayChars.bytes.resize(1 << 15);
         display.reserve(4096);
     }
 };
 
 Recorder g_recorder;
 
-void copyText(char (&dst)[kTextBufferBytes], const char *src) {
-    size_t n = 0;
-    if (src != nullptr) {
-        n = strnlen(src, kTextLimit);
-        std::memcpy(dst, src, n);
-    }
+void copyText(char (&dst)[kTextBufferBytes], const char *src, uint32_t n) {
+    std::memcpy(dst, src, n);
     dst[n] = '\0';
 }
 
@@ -191,31 +234,39 @@ int32_t pu_AddDecodedFieldsData(PreDecodeRequest *request, uint32_t spanCount,
                                 ValueSpan *spans, char *text, uint32_t spanSelector,
                                 char *label, uint32_t fieldId, uint32_t zero1,
                                 uint32_t zero2) {
-    DecodedRecord &rec = g_recorder.decoded.emplace_back();
-    HostDecodedField &f = rec.field;
-    copyText(f.text, text);
-    copyText(f.label, label);
-    f.fieldId = fieldId;
-    f.selector = spanSelector;
-    f.arg8 = zero1;
-    f.arg9 = zero2;
+    Recorder &r = g_recorder;
+    DecodedEntry e{};
+    e.text = r.decodedChars.append(text, e.textLength);
+    e.label = r.decodedChars.append(label, e.labelLength);
+    e.fieldId = fieldId;
+    e.selector = spanSelector;
+    e.arg8 = zero1;
+    e.arg9 = zero2;
     if (request != nullptr && request->outputLines != nullptr) {
         const size_t line = size_t{request->currentLineIndex} * DPX_OUTPUT_LINE_SIZE;
-        f.lineLayerCode = static_cast<uint8_t>(request->outputLines[line]);
+        e.lineLayerCode = static_cast<uint8_t>(request->outputLines[line]);
     }
-    rec.firstSpan = g_recorder.spans.size();
-    f.spanCount = spans != nullptr ? spanCount : 0;
-    for (uint32_t i = 0; i < f.spanCount; ++i) {
-        g_recorder.spans.push_back(HostSpan{spans[i].value, spans[i].firstBit, spans[i].lastBit});
+    e.firstSpan = static_cast<uint32_t>(r.spansUsed);
+    e.spanCount = spans != nullptr ? spanCount : 0;
+    if (r.spans.size() - r.spansUsed < e.spanCount) {
+        r.spans.resize(std::max(r.spans.size() * 2, r.spansUsed + e.spanCount));
     }
+    r.spansUsed += e.spanCount;
+    HostSpan *to = r.spans.data() + e.firstSpan;
+    for (uint32_t i = 0; i < e.spanCount; ++i) {
+        to[i] = HostSpan{spans[i].value, spans[i].firstBit, spans[i].lastBit};
+    }
+    r.decoded.push_back(e);
     return 1;
 }
 
 int32_t pu_AddFieldsToDisplayData(PreDecodeRequest * /*request*/, char *text,
                                   uint32_t displayId) {
-    HostDisplayField &f = g_recorder.display.emplace_back();
-    copyText(f.text, text);
-    f.displayId = displayId;
+    Recorder &r = g_recorder;
+    DisplayEntry e{};
+    e.text = r.displayChars.append(text, e.textLength);
+    e.displayId = displayId;
+    r.display.push_back(e);
     return 1;
 }
 
@@ -341,30 +392,100 @@ void host_FreeRequest(PreDecodeRequest *request) {
 
 // ---- what the module reported --------------------------------------------------
 
+void host_ClearDecodedRecords(void) {
+    Recorder &r = g_recorder;
+    r.decodedChars.used = 0;
+    r.decoded.clear();
+    r.spansUsed = 0;
+    r.decodedCopies.clear();
+}
+
+void host_ClearDisplayRecords(void) {
+    Recorder &r = g_recorder;
+    r.displayChars.used = 0;
+    r.display.clear();
+    r.displayCopies.clear();
+}
+
 void host_ClearRecords(void) {
-    g_recorder.decoded.clear();
-    g_recorder.spans.clear();
-    g_recorder.display.clear();
+    host_ClearDecodedRecords();
+    host_ClearDisplayRecords();
     g_recorder.createLayerCalls = 0;
 }
 
 uint32_t host_DecodedCount(void) { return static_cast<uint32_t>(g_recorder.decoded.size()); }
 
+int host_DecodedView(uint32_t index, HostFieldView *out) {
+    const Recorder &r = g_recorder;
+    if (index >= r.decoded.size() || out == nullptr) {
+        return 0;
+    }
+    const DecodedEntry &e = r.decoded[index];
+    out->text = r.decodedChars.at(e.text);
+    out->textLength = e.textLength;
+    out->label = r.decodedChars.at(e.label);
+    out->labelLength = e.labelLength;
+    out->fieldId = e.fieldId;
+    out->selector = e.selector;
+    out->spanCount = e.spanCount;
+    out->spans = e.spanCount != 0 ? r.spans.data() + e.firstSpan : nullptr;
+    out->arg8 = e.arg8;
+    out->arg9 = e.arg9;
+    out->lineLayerCode = e.lineLayerCode;
+    return 1;
+}
+
 // The span pointer is bound on every lookup because the span pool may have
 // moved since the field was recorded.
 const HostDecodedField *host_Decoded(uint32_t index) {
-    if (index >= g_recorder.decoded.size()) {
+    Recorder &r = g_recorder;
+    if (index >= r.decoded.size()) {
         return nullptr;
     }
-    DecodedRecord &rec = g_recorder.decoded[index];
-    rec.field.spans = rec.field.spanCount != 0 ? g_recorder.spans.data() + rec.firstSpan : nullptr;
-    return &rec.field;
+    while (r.decodedCopies.size() <= index) {
+        HostFieldView v{};
+        host_DecodedView(static_cast<uint32_t>(r.decodedCopies.size()), &v);
+        HostDecodedField &f = r.decodedCopies.emplace_back();
+        copyText(f.text, v.text, v.textLength);
+        copyText(f.label, v.label, v.labelLength);
+        f.fieldId = v.fieldId;
+        f.selector = v.selector;
+        f.spanCount = v.spanCount;
+        f.arg8 = v.arg8;
+        f.arg9 = v.arg9;
+        f.lineLayerCode = v.lineLayerCode;
+    }
+    HostDecodedField &f = r.decodedCopies[index];
+    f.spans = f.spanCount != 0 ? r.spans.data() + r.decoded[index].firstSpan : nullptr;
+    return &f;
 }
 
 uint32_t host_DisplayCount(void) { return static_cast<uint32_t>(g_recorder.display.size()); }
 
+int host_DisplayView(uint32_t index, HostDisplayView *out) {
+    const Recorder &r = g_recorder;
+    if (index >= r.display.size() || out == nullptr) {
+        return 0;
+    }
+    const DisplayEntry &e = r.display[index];
+    out->text = r.displayChars.at(e.text);
+    out->textLength = e.textLength;
+    out->displayId = e.displayId;
+    return 1;
+}
+
 const HostDisplayField *host_Display(uint32_t index) {
-    return index < g_recorder.display.size() ? &g_recorder.display[index] : nullptr;
+    Recorder &r = g_recorder;
+    if (index >= r.display.size()) {
+        return nullptr;
+    }
+    while (r.displayCopies.size() <= index) {
+        const DisplayEntry &e = r.display[r.displayCopies.size()];
+        HostDisplayField &f = r.displayCopies.emplace_back();
+        copyText(f.text, r.displayChars.at(e.text), e.textLength);
+        f.displayId = e.displayId;
+    }
+    return &r.displayCopies[index];
 }
 
 uint32_t host_CreateLayerCalls(void) { return g_recorder.createLayerCalls; }

@@ -67,11 +67,43 @@ typedef struct HostDisplayField {
     uint32_t displayId;
 } HostDisplayField;
 
-/* Forget every recorded field (both kinds). */
+/* A recorded field as it lies in the recorder: texts (NUL-terminated, at
+ * most 255 characters) and spans point into the recorder's own storage and
+ * stay valid until a field of the same kind is recorded or the records of
+ * that kind are cleared.  Reading them copies nothing. */
+typedef struct HostFieldView {
+    const char *text;
+    uint32_t textLength;
+    const char *label;
+    uint32_t labelLength;
+    uint32_t fieldId;
+    uint32_t selector;
+    uint32_t spanCount;
+    const HostSpan *spans;
+    uint32_t arg8;
+    uint32_t arg9;
+    uint8_t lineLayerCode;
+} HostFieldView;
+
+typedef struct HostDisplayView {
+    const char *text;
+    uint32_t textLength;
+    uint32_t displayId;
+} HostDisplayView;
+
+/* Forget every recorded field (both kinds), and the layer-call count. */
 void host_ClearRecords(void);
+/* Forget the decoded fields only, or the display fields only. */
+void host_ClearDecodedRecords(void);
+void host_ClearDisplayRecords(void);
 uint32_t host_DecodedCount(void);
-const HostDecodedField *host_Decoded(uint32_t index); /* null when out of range */
+/* Fill *out with the index-th decoded field; 0 when out of range. */
+int host_DecodedView(uint32_t index, HostFieldView *out);
+/* The same field copied into a fixed-size record that stays valid until the
+ * records are cleared; null when out of range. */
+const HostDecodedField *host_Decoded(uint32_t index);
 uint32_t host_DisplayCount(void);
+int host_DisplayView(uint32_t index, HostDisplayView *out);
 const HostDisplayField *host_Display(uint32_t index);
 /* Number of pu_CreateNewLayerInfo calls since the last host_ClearRecords. */
 uint32_t host_CreateLayerCalls(void);

@@ -163,10 +163,7 @@ int report(DecodeState *st, Request<P> *rq, FieldIndex index) {
     if constexpr (P == Pass::Decoded || P == Pass::Display) {
         TextBuffers &buf = g_text<P>;
         TextBuf text{buf.text, sizeof buf.text, 0};
-        TextBuf value{buf.valueText, sizeof buf.valueText, 0};
         text.clear();
-        value.clear();
-        detail::renderValue(f, st->field, value, P == Pass::Display);
         if constexpr (P == Pass::Decoded) {
             if (rq->outputLines != nullptr) {
                 char *line = rq->outputLines +
@@ -175,13 +172,12 @@ int report(DecodeState *st, Request<P> *rq, FieldIndex index) {
                 line[1] = 0;
                 line[2] = 0;
             }
-            text.blanks(f.textIndent);
-            text.append(f.label);
-            text.append("=", 1);
+            // Indent, label and '=' in one copy, then the value and its suffix.
+            text.append(kTextPrefixes.chars + kTextPrefixes.at[index], kTextPrefixes.length[index]);
         }
-        text.append(value.data, value.len);
+        detail::renderValue(f, st->field, text, P == Pass::Display);
         if constexpr (P == Pass::Decoded)
-            text.append(f.suffix);
+            text.append(f.suffix, kTextPrefixes.suffixLength[index]);
         // An access point name is rendered by the host; its failure ends the pass.
         if (f.render == Render::AccessPointName &&
             pu_access_point_name(text.data, st->field.value, st) == 0)

@@ -29,7 +29,6 @@ inline Scratch g_scratch{};
 // Text buffers of the reporting passes.
 struct TextBuffers {
     char text[256];
-    char valueText[500];
 };
 
 template <Pass P>

@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <string_view>
 
 namespace camel {
 
@@ -25,15 +26,8 @@ struct TextBuf {
         len += n;
         data[len] = '\0';
     }
-    void append(const char *s) { append(s, std::strlen(s)); }
-    void blanks(size_t n) {
-        static constexpr char kBlanks[] = "        ";
-        while (n > 0) {
-            const size_t k = n < 8 ? n : 8;
-            append(kBlanks, k);
-            n -= k;
-        }
-    }
+    // A literal's length is known at compile time.
+    void append(std::string_view s) { append(s.data(), s.size()); }
     void decimal(uint32_t v) {
         char tmp[12];
         size_t i = sizeof tmp;

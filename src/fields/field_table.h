@@ -1782,6 +1782,42 @@ constexpr LabelLengths computeLabelLengths() {
 }
 inline constexpr LabelLengths kLabelLengths = computeLabelLengths();
 
+// The start of every field's decoded-field text, ready to copy in one
+// piece: the text indent's blanks, the label and '='; and the length of the
+// text that follows the value.
+constexpr size_t textPrefixBytes() {
+    size_t n = 0;
+    for (size_t i = 0; i < kFieldCount; ++i)
+        n += kFields[i].textIndent + kLabelLengths.n[i] + 1u;
+    return n;
+}
+struct TextPrefixes {
+    char chars[textPrefixBytes()];
+    uint32_t at[kFieldCount];
+    uint16_t length[kFieldCount];
+    uint8_t suffixLength[kFieldCount];
+};
+constexpr TextPrefixes computeTextPrefixes() {
+    TextPrefixes out{};
+    size_t at = 0;
+    for (size_t i = 0; i < kFieldCount; ++i) {
+        const FieldDef &f = kFields[i];
+        out.at[i] = static_cast<uint32_t>(at);
+        for (size_t k = 0; k < f.textIndent; ++k)
+            out.chars[at++] = ' ';
+        for (size_t k = 0; k < kLabelLengths.n[i]; ++k)
+            out.chars[at++] = f.label[k];
+        out.chars[at++] = '=';
+        out.length[i] = static_cast<uint16_t>(at - out.at[i]);
+        size_t suffix = 0;
+        while (f.suffix[suffix] != '\0')
+            ++suffix;
+        out.suffixLength[i] = static_cast<uint8_t>(suffix);
+    }
+    return out;
+}
+inline constexpr TextPrefixes kTextPrefixes = computeTextPrefixes();
+
 constexpr uint32_t displayIdOf(uint32_t id) { return kDisplayIds.id[fieldIndex(id)]; }
 
 namespace detail {

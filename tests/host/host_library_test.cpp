@@ -1,6 +1,5 @@
-// The stand-in host libraries: how failures are injected, access point name
-// rendering and the key table layout they hand out.  (What they record and the
-// states they prepare are what every end-to-end test starts from.)
+// The stand-in host libraries: what they record, how failures are injected,
+// access point name rendering and the key table layout they hand out.
 
 #include "dpx_standin_host.h"
 
@@ -13,6 +12,86 @@
 #include <vector>
 
 namespace {
+
+TEST(HostRecorder, CopiesFieldsBeforeTheCallReturnsAndCutsTextsAt255) {
+    host_ClearRecords();
+    char text[] = "Invoke ID=1";
+    std::string label(300, 'b');
+    ValueSpan span{0x01, 9, 16, 0, {0, 0}};
+    pu_AddDecodedFieldsData(nullptr, 1, &span, text, 1, label.data(), 1066, 0, 5);
+    pu_AddFieldsToDisplayData(nullptr, label.data(), 12);
+    // The module reuses its buffers for the next field at once.
+    std::strcpy(text, "changed");
+    span.value = 0xFF;
+
+    ASSERT_EQ(host_DecodedCount(), 1u);
+    const HostDecodedField *f = host_Decoded(0);
+    EXPECT_STREQ(f->text, "Invoke ID=1");
+    EXPECT_EQ(f->label, std::string(255, 'b'));
+    EXPECT_EQ(std::tuple(f->fieldId, f->selector, f->arg9), std::tuple(1066u, 1u, 5u));
+    ASSERT_EQ(f->spanCount, 1u);
+    EXPECT_EQ(f->spans[0].value, 0x01u);
+    EXPECT_EQ(host_Decoded(1), nullptr);
+    ASSERT_EQ(host_DisplayCount(), 1u);
+    EXPECT_EQ(host_Display(0)->text, std::string(255, 'b'));
+    EXPECT_EQ(host_Display(0)->displayId, 12u);
+    host_ClearRecords();
+    EXPECT_EQ(host_DecodedCount() + host_DisplayCount(), 0u);
+}
+
+// The recorder appends into pools that grow while a message is recorded:
+// every field must read back as recorded however far the pools moved, and
+// each kind of record is cleared on its own.
+TEST(HostRecorder, ViewsAndCopiesReadBackEveryFieldWhileThePoolsGrow) {
+    host_ClearRecords();
+    constexpr uint32_t kFields = 700; // 700 texts of up to 255 characters: past the pools' first size
+    const auto textOf = [](uint32_t i) { return std::string(i % 256, char('a' + i % 26)) + std::to_string(i); };
+    for (uint32_t i = 0; i < kFields; ++i) {
+        std::string text = textOf(i);
+        std::string label = "L" + std::to_string(i);
+        std::vector<ValueSpan> spans(i % 7);
+        for (uint32_t k = 0; k < spans.size(); ++k)
+            spans[k] = ValueSpan{i * 10 + k, i + k, i + k + 3, 0, {0, 0}};
+        pu_AddDecodedFieldsData(nullptr, uint32_t(spans.size()), spans.empty() ? nullptr : spans.data(),
+                                text.data(), i, label.data(), 1000 + i, 0, 0);
+        pu_AddFieldsToDisplayData(nullptr, text.data(), i);
+    }
+    ASSERT_EQ(host_DecodedCount(), kFields);
+    const HostDecodedField *first = host_Decoded(0);
+    for (uint32_t i = 0; i < kFields; ++i) {
+        SCOPED_TRACE(i);
+        const std::string want = textOf(i).substr(0, 255);
+        HostFieldView v{};
+        ASSERT_EQ(host_DecodedView(i, &v), 1);
+        EXPECT_EQ(std::string(v.text, v.textLength), want);
+        EXPECT_EQ(v.text[v.textLength], '\0');
+        EXPECT_EQ(std::string(v.label, v.labelLength), "L" + std::to_string(i));
+        EXPECT_EQ(std::tuple(v.fieldId, v.selector, v.spanCount), std::tuple(1000 + i, i, i % 7));
+        for (uint32_t k = 0; k < v.spanCount; ++k)
+            EXPECT_EQ(std::tuple(v.spans[k].value, v.spans[k].firstBit, v.spans[k].lastBit),
+                      std::tuple(i * 10 + k, i + k, i + k + 3));
+        const HostDecodedField *copy = host_Decoded(i);
+        EXPECT_EQ(copy->text, want);
+        EXPECT_EQ(copy->spanCount, v.spanCount);
+        HostDisplayView d{};
+        ASSERT_EQ(host_DisplayView(i, &d), 1);
+        EXPECT_EQ(std::string(d.text, d.textLength), want);
+        EXPECT_EQ(host_Display(i)->displayId, i);
+    }
+    EXPECT_EQ(host_Decoded(0), first) << "a copy handed out stays where it is";
+    HostFieldView none{};
+    EXPECT_EQ(host_DecodedView(kFields, &none), 0);
+
+    host_ClearDecodedRecords();
+    EXPECT_EQ(host_DecodedCount(), 0u);
+    ASSERT_EQ(host_DisplayCount(), kFields) << "the display records are kept";
+    EXPECT_EQ(host_Display(kFields - 1)->text, textOf(kFields - 1).substr(0, 255));
+    char again[] = "again";
+    pu_AddDecodedFieldsData(nullptr, 0, nullptr, again, 0, nullptr, 7, 0, 0);
+    EXPECT_STREQ(host_Decoded(0)->text, "again");
+    EXPECT_STREQ(host_Decoded(0)->label, "");
+    host_ClearRecords();
+}
 
 TEST(HostRealloc, FailsExactlyTheNthCallCountedFromTheSetting) {
     host_SetReallocFailAt(3);

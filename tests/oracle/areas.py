@@ -13,7 +13,11 @@ ISUP-format numbers, whose digits and attributes become rows of VALUES.
 
 TYPES = {
     # call control
+    'bool': '<- hex(00), - hex(ff), - oct(1,1)>',
     'csid': 'int(1,127)', 'side': 'one(1,2)', 'cug': 'oct(4,4)',
+    'legid': 'one(1,2,1..30)', 'leg': '<80 legid, 81 legid>', 'sending': '(80 legid)',
+    'receiving': '(81 legid)',
+    'ext': '[30 1 2 {02 int(0,127), 0A one(0,1), A1 (04 oct(1,4))}]',
     'sii': '{A0 .4 {81 side, 82 .5 side, 84 .5 side}, A1 .3 {81 side, 82 .5 side}, '
            '82 .4 one(0,1), 84 .3 one(0..3), 8D .2 null, 9F32 .3 side, 9F33 .3 side, '
            '9F34 .3 side}',
@@ -30,7 +34,7 @@ TYPES = {
               '84 .5 octs(4,0x80|0xC0|0xE0|0xF0), 85 .3 octs(0..7) + oct(1,1), A6 .5 bearers, '
               'A7 .4 basicservice, 89 .3 hex(8890), 8A .2 hex(8890a2)}',
     # charging, call gap, announcements
-    'sending': 'leg(0)',
+    'ffd': '<- oct(1,8), - oct(1,40), - oct(1,52), - oct(1,160)>',
     'burst': '{80 .6 ints(1..3), 81 .6 ints(1..127,1..127,128..1200), 82 .6 ints(1..3), '
              '83 .6 ints(1..20), 84 .6 ints(1..20)}',
     'audible': '<01 bool, A1 {80 .6 ints(1..127,128..1200), A1 burst}>',
@@ -55,6 +59,8 @@ TYPES = {
                  '84 .3 oct(1,2), 85 .4 ints(1..127), 86 .4 ints(1..127), 87 .3 one(0,1,2), '
                  '88 .3 bool, 89 .3 bool, 8A .3 bool}',
     # SMS and GPRS
+    'gsn': '<- 6 hex(10) + oct(4,4), - 4 hex(41) + oct(16,16)>',
+    'cellorlai': '<- 7 cell, - 3 lai>', 'rai': 'lai + oct(1,1)',
     'octet': 'octs(0..255)', 'eventtypesms': 'one(1,2,3,11,12,13,0..255)',
     # MS network capability (two octets) and radio access capabilities of
     # several access technologies (GSM E then GSM 1800 with A5 and multislot
@@ -118,17 +124,17 @@ AREAS = [
                   '9F37 .2 null, 9F38 .2 null, 9F39 .2 one(0..255), 9F3A .1 null}'),
              22: ('releaseCall', '04 cause'),
              23: ('requestReportBCSMEvent', '30 {A0 [30 1 4 {80 eventtype, 81 one(0,1,2), '
-                  'A2 .7 leg(0), BE .2 {81 int(0,2047)}, 9F32 .1 null}], A2 .2 ext}'),
-             24: ('eventReportBCSM', '30 {- <%s>, A3 .7 leg(1), A4 .7 {80 one(0,1)}}'
+                  'A2 .7 sending, BE .2 {81 int(0,2047)}, 9F32 .1 null}], A2 .2 ext}'),
+             24: ('eventReportBCSM', '30 {- <%s>, A3 .7 receiving, A4 .7 {80 one(0,1)}}'
                   % ERB_EVENTS),
-             32: ('initiateCallAttempt', '30 {A0 callednumbers, A4 .2 ext, A5 .5 leg(0), '
+             32: ('initiateCallAttempt', '30 {A0 callednumbers, A4 .2 ext, A5 .5 sending, '
                   '86 .4 csid, 9E .6 calling, 9F33 .4 oct(1,8), 9F34 .4 addr, 9F35 .2 null}'),
              33: ('resetTimer', '30 {80 one(0), 81 sk2, A2 .2 ext, 83 .3 csid}'),
              44: ('callInformationReport', '30 {A0 [30 1 4 <- {80 hex(00), A1 {80 int(0,255)}}, '
                   '- {80 hex(01), A1 {81 dtime}}, - {80 hex(02), A1 {82 int(0,2147483647)}}, '
-                  '- {80 hex(1E), A1 {9E cause}}>], A2 .2 ext, A3 .7 leg(1)}'),
+                  '- {80 hex(1E), A1 {9E cause}}>], A2 .2 ext, A3 .7 receiving}'),
              45: ('callInformationRequest', '30 {A0 [0A 1 4 one(0,1,2,30)], A2 .2 ext, '
-                  'A3 .7 leg(0)}'),
+                  'A3 .7 sending}'),
              53: ('cancel', '- <80 6 int(-128,127), 81 4 null>'),
              56: CWA, 88: CWA,
              86: ('dFCWithArgument', '30 {81 .7 csid, A2 .3 ext}'),
@@ -150,7 +156,7 @@ AREAS = [
                   '82 .5 one(0,1)}}'),
              35: ('applyCharging', '30 {80 (A0 tdc), A2 .7 sending, A3 .1 ext, '
                   'BF32 .3 chargingaddress}'),
-             36: ('applyChargingReport', '04 {A0 {A0 leg(1), A1 timeinfo, 82 .7 bool, '
+             36: ('applyChargingReport', '04 {A0 {A0 receiving, A1 timeinfo, 82 .7 bool, '
                   '83 .3 null, A4 .1 ext, A5 .3 chargingaddress}}'),
              41: ('callGap', '30 {A0 gapcriteria, A1 {80 ints(-2..127,128..86400), '
                   '81 ints(-1..127,128..32767,32768..60000)}, 82 .4 one(0,1), '
@@ -331,10 +337,10 @@ CS   | cell id: LAC | | gsm_map.cellGlobalIdOrServiceAreaIdFixedLength | 2087 | 
 CS   | cell id: cell identity | | gsm_map.cellGlobalIdOrServiceAreaIdFixedLength | 2088 | cgi:ci
 CS   | LAI: MCC | | e212.lai.mcc | 2079 | digits
 CS   | LAI: MNC | | e212.lai.mnc | 2083 2086 | mnc
-CS   | LAI: LAC | | gsm_map.laiFixedLength | 2087 | lac
-CA   | leg id: sending side | | inap.sendingSideID sendingSideID | 1543 1551 | sending | -2
-CA   | leg id: receiving side | | inap.receivingSideID receivingSideID | 1543 1547 | receiving | -2
-CA   | leg id: side value | | inap.sendingSideID inap.receivingSideID sendingSideID receivingSideID | 1554 | hexint
+CS   | LAI: LAC | | gsm_map.laiFixedLength | 2087 | cgi:lac
+CA   | leg id: sending side | | inap.sendingSideID sendingSideID | 1543 1551 | const:128 | -2
+CA   | leg id: receiving side | | inap.receivingSideID receivingSideID | 1543 1547 | const:129 | -2
+CA   | leg id: side value | | inap.sendingSideID inap.receivingSideID sendingSideID receivingSideID | 1554 | int:16
 CSG  | monitor mode | | monitorMode | 1909 | int
 C    | application timer | | applicationTimer | 1916 | int
 CS   | misc call info: message type | | inap.messageType | 1608 | int
@@ -342,10 +348,10 @@ C    | CG encountered | | cGEncountered | 1637 | int
 C    | call segment id | | callSegmentID newCallSegment | 4181 | octets
 C    | CUG index | | cug_Index | 1193 | int
 C    | CUG interlock | | cug_Interlock | 1948 | uint
-C    | NA Oli info | | naOliInfo | 2017 | hexint
+C    | NA Oli info | | naOliInfo | 2017 | int:16
 C    | carrier selection | | carrier | 1955 | at:0
 C    | alerting pattern: type | | alertingPattern | 1128 | at:2
-C    | service interaction: conference treatment | | conferenceTreatmentIndicator | 1977 | hexint
+C    | service interaction: conference treatment | | conferenceTreatmentIndicator | 1977 | int:16
 C    | service interaction: hold treatment | | holdTreatmentIndicator | 2001 | int
 C    | service interaction: bothway through connection | | bothwayThroughConnectionInd | 1993 | int
 C    | service interaction: connected number treatment | | connectedNumberTreatmentInd | 1996 | int
@@ -368,9 +374,9 @@ C    | ext basic service code: teleservice | ext_basicServiceCode | gsm_map.ext_
 C    | call reference number | | callReferenceNumber | 2135 4177 | octets
 CS   | IDP extension: MS classmark 2 | | ms_Classmark2 | 4218 | octets
 CS   | IDP extension: IMEI | | iMEI | 4221 | octets
-C    | IDP extension: supported CAMEL phases | | supportedCamelPhases | 4192 | bitstring | -1
-C    | IDP extension: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | bitstring | -1
-C    | IDP extension: basic service code | | ext_basicServiceCode2 | 4224 | explicit | -2
+C    | IDP extension: supported CAMEL phases | | supportedCamelPhases | 4192 | octets:-1 | -1
+C    | IDP extension: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | octets:-1 | -1
+C    | IDP extension: basic service code | | ext_basicServiceCode2 | 4224 | octets:-2 | -2
 C    | IDP extension: low layer compatibility | | lowLayerCompatibility lowLayerCompatibility2 | 4228 | octets
 A    | max call period duration | | maxCallPeriodDuration | 1389 | int
 A    | release if duration exceeded | | releaseIfdurationExceeded | 1392 | bool
@@ -401,11 +407,11 @@ A    | inband interval | | interval | 1328 | int
 A    | tone id | | toneID | 1311 | uint
 A    | tone duration | tone_element | toneDuration | 1314 | int
 A    | variable part: integer | | integer | 1359 | int
-A    | variable part: number type of digits | number | isup.generic_digits | 1649 | typeofdigits
+A    | variable part: number type of digits | number | isup.generic_digits | 1649 | bits:0:5
 A    | variable part: number digits | number | isup.generic_digits | 3539 3551 | gdigits
 A    | variable part: time hour | | time | 1362 | at:0
 A    | variable part: time minute | | time | 1363 | at:1
-A    | variable part: date year | | date | 1366 | year
+A    | variable part: date year | | date | 1366 | uint:2
 A    | variable part: date month | | date | 1367 | at:2
 A    | variable part: date day | | date | 1368 | at:3
 A    | variable part: price | | price | 1371 | octets
@@ -424,10 +430,10 @@ A    | collected digits: error treatment | | errorTreatment | 1884 | int
 A    | collected digits: interruptable announcement | | interruptableAnnInd | 1887 | bool
 A    | collected digits: voice information | | voiceInformation | 1891 | bool
 A    | collected digits: voice back | | voiceBack | 1895 | bool
-A    | digits response: type of digits | digitsResponse | isup.generic_digits | 1647 | typeofdigits
+A    | digits response: type of digits | digitsResponse | isup.generic_digits | 1647 | bits:0:5
 A    | digits response: digits | digitsResponse | isup.generic_digits | 3536 3548 | gdigits
-A    | initiate call attempt: supported CAMEL phases | | supportedCamelPhases | 4192 | bitstring | -1
-A    | initiate call attempt: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | bitstring | -1
+A    | initiate call attempt: supported CAMEL phases | | supportedCamelPhases | 4192 | octets:-1 | -1
+A    | initiate call attempt: offered CAMEL4 functionalities | | offeredCamel4Functionalities | 4195 | octets:-1 | -1
 A    | cancel failed: problem | | problem | 1924 | int
 A    | cancel failed: operation | | operation | 1927 | int8
 A    | requested info error | | PAR_requestedInfoError | 1930 | int
@@ -444,8 +450,8 @@ S    | SMS address nature of address | SMS_ADDRESSES | gsm_map.nature_of_number 
 S    | SMS address numbering plan | SMS_ADDRESSES | gsm_map.number_plan | 2054 | int
 G    | event type GPRS | | gPRSEventType | 2433 | int
 G    | MSISDN digits | mSISDN | e164.msisdn gsm_map.address.digits e212.imsi | 2058 | filler
-G    | PDP type organisation | | pDPTypeOrganization | 2472 | hexint
-G    | PDP type number | | pDPTypeNumber | 2475 | hexint
+G    | PDP type organisation | | pDPTypeOrganization | 2472 | int:16
+G    | PDP type number | | pDPTypeNumber | 2475 | int:16
 G    | PDP address | | pDPAddress | 2478 | octets
 G    | access point name octets | | accessPointName | 2413 | octets
 G    | RAI: MCC | routeingAreaIdentity | e212.rai.mcc | 2442 | digits
@@ -456,12 +462,12 @@ G    | location: cell or LAI MCC | | cellGlobalIdOrServiceAreaIdOrLAI | 2079 | c
 G    | location: cell or LAI MNC | | cellGlobalIdOrServiceAreaIdOrLAI | 2083 2086 | cgi:mnc
 G    | location: cell or LAI LAC | | cellGlobalIdOrServiceAreaIdOrLAI | 2087 | cgi:lac
 G    | charging id | | chargingID | 2463 | octets
-G    | SGSN capabilities: AOC support | | sGSNCapabilities | 2554 | aoc
-G    | GSN address | | gsn_Address gGSNAddress | 2594 2590 | gsn
+G    | SGSN capabilities: AOC support | | sGSNCapabilities | 2554 | bits:0:1
+G    | GSN address | | gsn_Address gGSNAddress | 2594 2590 | octets:1
 G    | PDP initiation type | | pDPInitiationType | 2583 | int
 G    | initiating entity | | initiatingEntity | 2484 | int
-G    | GPRS cause | | gprsCause gPRSCause | 2424 | hexint
-G    | PDP ID | | pDPID pdpID | 1270 | hexint
+G    | GPRS cause | | gprsCause gPRSCause | 2424 | int:16
+G    | PDP ID | | pDPID pdpID | 1270 | int:16
 G    | misc info: message type | | inap.messageType messageType | 1608 | int
 G    | active | | active | 2364 | bool
 G    | max transferred volume | | maxTransferredVolume | 2317 | int

@@ -28,8 +28,7 @@ Two checks run over the messages:
   and parameter) lies in the bit span of a reported field.
 
 Where our decoder's rules make a value differ from tshark's, the expected
-value is tshark's adjusted by the rule; every rule applied is counted, and a
-rule of an area that never fires is reported as a failure.
+value is tshark's adjusted by the named rule.
 """
 
 import random
@@ -47,11 +46,7 @@ def init(capgen):
 # --------------------------------------------------------------------------
 # Typed value generators: rng -> content octets
 # --------------------------------------------------------------------------
-def digits(rng, lo, hi):
-    # tshark's E.164 code trips on "883x": no 8 first (capgen does the same)
-    return C._digits(rng, lo, hi)
-
-
+# C._digits: digits never starting with 8 (tshark's E.164 code trips on "883x")
 def octets(rng, lo, hi):
     return bytes(rng.randrange(256) for _ in range(rng.randint(lo, hi)))
 
@@ -75,17 +70,13 @@ def uint(lo, hi):
     return f
 
 
-def nai(rng):
-    return rng.choice([1, 2, 3, 4, rng.randint(0, 127)])
-
-
 def isup_number(kind, lo):
     """ISUP number: odd/even and nature of address, then INN and numbering
     plan (called), NI, plan, presentation and screening (calling layout), or
     plan and presentation (original called / redirecting)."""
     def f(rng):
-        d = digits(rng, lo, 16)
-        first = C._oe(d) | nai(rng)
+        d = C._digits(rng, lo, 16)
+        first = C._oe(d) | rng.choice([1, 2, 3, 4, rng.randint(0, 127)])
         if kind == 'original':
             second = (rng.randint(0, 7) << 4) | (rng.choice([0, 0, 1, 3]) << 2)
         else:
@@ -124,13 +115,13 @@ def bearer_cap(rng):
 def address_string(lo=6, hi=15):
     return lambda rng: bytes([0x80 | (rng.randint(0, 7) << 4)
                               | rng.choice([1, 1, 0, 3, 4, 6, 8, 9])]) \
-        + C.tbcd(digits(rng, lo, hi))
+        + C.tbcd(C._digits(rng, lo, hi))
 
 
 def imsi(rng):
     mcc, mnc = rng.choice([('262', '01'), ('234', '15'), ('310', '410'), ('208', '10')])
     n = rng.choice([14, 15, 15]) - len(mcc) - len(mnc)
-    return C.tbcd(mcc + mnc + digits(rng, n, n))
+    return C.tbcd(mcc + mnc + C._digits(rng, n, n))
 
 
 def plmn_lac(rng):
@@ -139,37 +130,10 @@ def plmn_lac(rng):
     return C.plmn(mcc, mnc) + rng.randint(0, 65535).to_bytes(2, 'big')
 
 
-def plmn3(rng):
-    mcc = '%03d' % rng.randint(200, 799)
-    mnc = '%02d' % rng.randint(0, 99) if rng.random() < .6 else '%03d' % rng.randint(0, 999)
-    return mcc, mnc
-
-
-def cell_or_lai(rng):
-    """MCC-MNC-LAC and, for a cell or service area, its two-octet identity."""
-    mcc, mnc = plmn3(rng)
-    if rng.random() < .7:
-        return C.cgi(mcc, mnc, rng.randrange(65536), rng.randrange(65536))
-    return C.lai(mcc, mnc, rng.randrange(65536))
-
-
-def time_and_timezone(rng):
-    return C.time_and_timezone(rng.randint(2000, 2030), rng.randint(1, 12), rng.randint(1, 28),
-                               rng.randint(0, 23), rng.randint(0, 59), rng.randint(0, 59),
-                               rng.randint(-47, 56))
-
-
-def date_and_time(rng):
-    return C.date_and_time(rng.randint(2000, 2030), rng.randint(1, 12), rng.randint(1, 28),
-                           rng.randint(0, 23), rng.randint(0, 59), rng.randint(0, 59))
-
-
-def leg(side=None):
-    """LegID: sendingSideID [0] or receivingSideID [1]; side None: either."""
-    def f(rng):
-        s = rng.randint(0, 1) if side is None else side
-        return C.ctx(s, bytes([rng.choice([1, 2, rng.randint(1, 30)])]))
-    return f
+def when(rng):
+    """Year, month, day, hour, minute, second."""
+    return [rng.randint(lo, hi) for lo, hi in ((2000, 2030), (1, 12), (1, 28), (0, 23),
+                                               (0, 59), (0, 59))]
 
 
 def service_key(*tops):
@@ -184,17 +148,6 @@ def octs(*values):
                              else rng.randint(*v) for v in values)
 
 
-def extensions(rng):
-    """ExtensionField list: local type, criticality, value [1]."""
-    return b''.join(C.seq(C.integer(rng.randint(0, 127)), C.tlv(0x0A, bytes([rng.randint(0, 1)])),
-                          C.ctxc(1, C.octets(octets(rng, 1, 4))))
-                    for _ in range(rng.randint(1, 2)))
-
-
-def boolean(rng):
-    return bytes([rng.choice([0, 0xFF, rng.randint(1, 255)])])
-
-
 def generic_digits(rng):
     """Type of digits (bits 5-1), encoding scheme (bits 8-6), BCD digits
     (low half first) or binary octets."""
@@ -202,7 +155,7 @@ def generic_digits(rng):
     head = bytes([(scheme << 5) | rng.randint(0, 31)])
     if scheme in (0, 1):
         n = rng.randint(1, 8) * 2 - (scheme == 1)
-        return head + C.bcd_isup(digits(rng, n, n))
+        return head + C.bcd_isup(C._digits(rng, n, n))
     return head + octets(rng, 1, 8)
 
 
@@ -226,39 +179,30 @@ def apn(rng):
     return C.apn('.'.join(labels))
 
 
-def gsn_address(rng):
-    """Address type in bits 2-1, length in bits 8-3 (0x10: IPv4, 0x41: IPv6)."""
-    if rng.random() < .6:
-        return bytes([0x10]) + octets(rng, 4, 4)
-    return bytes([0x41]) + octets(rng, 16, 16)
-
-
 def pick(*hexes):
     """A constant, or one of a few."""
-    if len(hexes) == 1:
-        return lambda rng: bytes.fromhex(hexes[0])
     return lambda rng: bytes.fromhex(rng.choice(hexes))
 
 
 GEN = {  # name -> builder; with (arguments): name -> factory of a builder
     'null': lambda rng: b'', 'one': one, 'ints': ints, 'uint': uint,
     'int': lambda lo, hi: (lambda rng: C.int_content(rng.randint(lo, hi))),
-    'oct': lambda lo, hi: (lambda rng: octets(rng, lo, hi)), 'hex': pick, 'leg': leg,
+    'oct': lambda lo, hi: (lambda rng: octets(rng, lo, hi)), 'hex': pick,
     'gnum': generic_number, 'addr': address_string, 'called': isup_called,
     'calling': isup_calling, 'original': isup_original, 'cause': cause, 'bearer': bearer_cap,
-    'imsi': imsi, 'lai': plmn_lac, 'time': time_and_timezone, 'dtime': date_and_time,
+    'imsi': imsi, 'lai': plmn_lac,
+    'time': lambda rng: C.time_and_timezone(*when(rng), rng.randint(-47, 56)),
+    'dtime': lambda rng: C.date_and_time(*when(rng)),
     'cell': lambda rng: plmn_lac(rng) + rng.randint(0, 65535).to_bytes(2, 'big'),
-    'skey': service_key, 'octs': octs, 'ext': extensions, 'bool': boolean,
-    'gdigits': generic_digits, 'validity': validity_period, 'apn': apn, 'gsn': gsn_address, 'cellorlai': cell_or_lai,
-    'tbcd': lambda lo, hi: (lambda rng: C.tbcd(digits(rng, lo, hi))),
-    'rai': lambda rng: C.rai(*plmn3(rng), rng.randrange(65536), rng.randrange(256)),
-    'ffd': lambda rng: octets(rng, 1, rng.choice((8, 40, 52, 160))),
+    'skey': service_key, 'octs': octs,
+    'gdigits': generic_digits, 'validity': validity_period, 'apn': apn,
+    'tbcd': lambda lo, hi: (lambda rng: C.tbcd(C._digits(rng, lo, hi))),
     'redirection': lambda rng: bytes([(rng.randint(0, 3) << 4) | rng.randint(0, 6),
                                       (rng.randint(0, 6) << 4) | rng.randint(1, 5)]),
     'text': lambda lo, hi: (lambda rng: bytes(rng.randint(0x20, 0x7E)
                                               for _ in range(rng.randint(lo, hi)))),
 }
-DEFAULTS = ('addr', 'leg', 'gnum', 'skey')      # factories also named without arguments
+DEFAULTS = ('addr', 'gnum', 'skey')      # factories also named without arguments
 
 
 # --------------------------------------------------------------------------
@@ -462,26 +406,24 @@ def n_capped(limit, rule):
 
 
 NORMS = {
-    'int': lambda show, off, size, data: (int(show, 0), None),
+    'int': lambda base='0': lambda show, off, size, data: (int(show, int(base)), None),
     'int8': lambda show, off, size, data: (int(show) % 256, None),      # shown signed
-    'hexint': lambda show, off, size, data: (int(show, 16), None),     # "02"
     'bool': lambda show, off, size, data: (int(show, 0) != 0, None),
     'digits': lambda show, off, size, data: (show.lower(), None),
-    'octets': lambda show, off, size, data: (data[off:off + size].hex(), None),
-    # a value shown by tshark as octets, read as one unsigned number
-    'uint': lambda show, off, size, data: (int.from_bytes(data[off:off + size], 'big'), None),
-    # a BIT STRING: tshark's field starts after the unused-bits octet
-    'bitstring': lambda show, off, size, data: (data[off - 1:off + size].hex(), None),
-    # an explicitly tagged CHOICE shown at its inner value; ours: the whole
-    # content (inner identifier, length and value)
-    'explicit': lambda show, off, size, data: (data[off - 2:off + size].hex(), None),
+    'const': lambda v: lambda show, off, size, data: (int(v), None),
+    # the octets tshark's field covers; octets:N: from N octets after its
+    # start (a BIT STRING's field starts after the unused-bits octet, an
+    # explicitly tagged CHOICE's at its inner value, ours at the content)
+    'octets': lambda first='0': lambda show, off, size, data: (
+        data[off + int(first):off + size].hex(), None),
+    # a value shown by tshark as octets, read as one unsigned number (of at
+    # most N octets)
+    'uint': lambda n=None: lambda show, off, size, data: (
+        int.from_bytes(data[off:off + (size if n is None else int(n))], 'big'), None),
     'at': lambda i: lambda show, off, size, data: (data[off + int(i)], None),
-    'sending': lambda show, off, size, data: (128, None),
-    'receiving': lambda show, off, size, data: (129, None),
     'octet': n_octet, 'mnc': n_mnc, 'cgi': n_cgi, 'time': n_time, 'validity': n_validity,
     'halves': n_half_octets('digits-all-half-octets', False),
     'filler': n_half_octets('tbcd-filler-shown', True),
-    'lac': lambda show, off, size, data: (plmn_at(data, off)[2], None),
     # call stop time: octets as on the wire, the year one 16-bit read, low
     # octet first (tshark: 'hh:mm:ss;dd/mm/yyyy' from swapped BCD)
     'stop': lambda i: lambda show, off, size, data: (
@@ -490,20 +432,17 @@ NORMS = {
     'bits': lambda *a: n_bits(*[int(x) for x in a[:3]],
                               *([tuple(int(v) for v in a[3].split('-'))] if len(a) > 3 else [])),
     'gdigits': n_generic_digits,
-    'typeofdigits': lambda show, off, size, data: (data[off] & 31, None),
-    'year': lambda show, off, size, data: (int.from_bytes(data[off:off + 2], 'big'), None),
     'gapinterval': n_capped(2, 'gap-interval-two-octets'),
     'freeformat': n_capped(52, 'free-format-data-52-octets'),
-    'gsn': lambda show, off, size, data: (data[off + 1:off + size].hex(), None),
-    'aoc': lambda show, off, size, data: (data[off] & 1, None),
     # a CHOICE tshark shows by its index: the identifier [n] constructed
     'choice': lambda show, off, size, data: (0xA0 + int(show), None),
 }
+FACTORIES = ('int', 'const', 'octets', 'uint', 'at', 'cgi', 'time', 'validity', 'stop', 'bits')
 
 
 def normaliser(spec):
     name, *args = spec.split(':')
-    return NORMS[name](*args) if args or name in ('bits',) else NORMS[name]
+    return NORMS[name](*args) if name in FACTORIES else NORMS[name]
 
 
 def o_value(f, want):
@@ -535,6 +474,32 @@ def read_rows(text, area):
         except (KeyError, ValueError, IndexError, TypeError) as exc:
             raise ValueError('value row %r: %r' % (line, exc)) from None
     return out
+
+
+# --------------------------------------------------------------------------
+# BER structure of a generated message (well-formed by construction)
+# --------------------------------------------------------------------------
+class Node:
+    """One element: identifier, offset, indefinite length, end (after any
+    end-of-contents) and the elements inside it."""
+    __slots__ = ('tag', 'off', 'indef', 'end', 'kids')
+
+    def kid(self, tag):
+        return next((k for k in self.kids if k.tag == tag), None)
+
+
+def parse_message(data):
+    """The message's element tree, from capgen's strict BER reader."""
+    path = []
+    for off, header, length, _, depth, tag, content_end in C.parse_ber(data):
+        n = Node()
+        n.tag, n.off, n.indef, n.kids = int.from_bytes(tag, 'big'), off, length is None, []
+        n.end = content_end + 2 * n.indef
+        del path[depth:]
+        if path:
+            path[-1].kids.append(n)
+        path.append(n)
+    return path[0]
 
 
 # --------------------------------------------------------------------------
@@ -580,6 +545,13 @@ class Stats:
         c[0] += 1
         c[1] += bool(ok)
 
+    def value(self, name, want, have, label, hexmsg):
+        """One compared value; the differences are grouped by value."""
+        self.count(name, have == want)
+        if have != want:
+            key = (repr(want), 'not reported' if have is None else repr(have))
+            self.by_value.setdefault(name, {}).setdefault(key, [0, label, hexmsg])[0] += 1
+
 
 def compare_values(label, hexmsg, tfields, md, payload, rows, stats):
     """tfields: tshark's fields of one message; md: our decoded-field pass.
@@ -604,11 +576,7 @@ def compare_values(label, hexmsg, tfields, md, payload, rows, stats):
             rules.add(rule)
             a, b = off + shift, off + shift + max(size, 1)
             mine = [f for o, f in ours if f['id'] in ids and a <= o < b]
-            have = o_value(mine[0], want) if mine else None
-            stats.count(name, have == want)
-            if have != want:
-                key = (repr(want), 'not reported' if have is None else repr(have))
-                stats.by_value.setdefault(name, {}).setdefault(key, [0, label, hexmsg])[0] += 1
+            stats.value(name, want, o_value(mine[0], want) if mine else None, label, hexmsg)
     rules.discard(None)
     return rules
 
@@ -694,15 +662,15 @@ def payload(root, stats, hexmsg):
     return comp.kids[-1 if comp.tag == 0xA1 else 1].off, comp.kids[-1].end, notes
 
 
-def check(area, corpus, pdml, oracle, ours, parse_node, tcap_rules):
+def check(area, corpus, pdml, oracle, ours, tcap_rules):
     """corpus [(label, hex)], tshark's PDML fields and oracle summaries, our
-    four-pass outputs; parse_node: BER reader; tcap_rules(data, root, ora)
+    four-pass outputs; tcap_rules(data, root, ora)
     -> TCAP-level rule names (oracle_compare's expectations)."""
     stats = Stats()
     rows = area['rows']
     for (label, hexmsg), tfields, ora, out in zip(corpus, pdml, oracle, ours):
         data = bytes.fromhex(hexmsg)
-        root = parse_node(data, 0)
+        root = parse_message(data)
         for tname, rule in area.get('field_rules', {}).items():
             if any(t[0] == tname for t in tfields):
                 stats.rule(rule, hexmsg)
@@ -734,33 +702,28 @@ def check(area, corpus, pdml, oracle, ours, parse_node, tcap_rules):
     return stats
 
 
-def report(area, stats, show, complete, rule_text):
-    """Summary lines and the number of disagreements.  complete: the corpus is
-    large enough that every row of the table and every rule of the area must
-    have been met."""
-    title = area['title']
-    lines = ['%s (value: agreed / compared):' % title]
-    missing = ['NEVER COMPARED %s: tshark showed it nowhere (table or corpus wrong?)' % r[0]
-               for r in area['rows'] if r[0] not in stats.compared] + \
+def report(title, stats, rows, rules, rule_text, show=20):
+    """Summary lines and the number of disagreements: every compared value
+    (agreed / compared), every named rule with its count, the differences;
+    a row never compared and a named rule never needed are failures."""
+    missing = ['NEVER COMPARED %s: tshark showed it nowhere (table or corpus wrong?)' % r
+               for r in rows if r not in stats.compared] + \
         ['RULE NEVER APPLIED %s: no message needed it (rule or corpus wrong?)' % r
-         for r in area['rules'] if r not in stats.rules]
-    missing = missing if complete else []
-    lines += ['  ' + m for m in missing]
+         for r in rules if r not in stats.rules]
+    lines = ['%s (value: agreed / compared; rule: messages):' % title] + \
+        ['  ' + m for m in missing]
     bad = len(missing)
     for key in sorted(stats.compared, key=lambda k: (k.startswith('coverage'), k)):
         n, a = stats.compared[key]
         lines.append('  %-48s %6d / %-6d%s' % (key, a, n, '' if a == n else
                                                  '  <-- %d differ' % (n - a)))
-    if stats.rules:
-        lines.append('%s: rules (our rules, tshark differs; messages, example):' % title)
-        for key in sorted(stats.rules):
-            cnt, ex = stats.rules[key]
-            lines.append('  %-36s %6d  %s' % (key, cnt, rule_text.get(key, '')))
-            lines.append('  %36s         e.g. %s' % ('', ex if len(ex) <= 120 else ex[:117] + '...'))
+    for key in sorted(set(rules) | set(stats.rules)):
+        lines.append('  rule %-43s %6d  %s' % (key, stats.rules.get(key, [0])[0],
+                                               rule_text.get(key, '')))
     for name in sorted(stats.by_value):
+        bad += sum(v[0] for v in stats.by_value[name].values())
         for (want, got), (cnt, label, hexmsg) in sorted(stats.by_value[name].items(),
                                                       key=lambda kv: -kv[1][0])[:show]:
-            bad += cnt
             lines.append('  DIFFER %s: expected %s, ours %s (%d, e.g. %s)\n      %s'
                          % (name, want, got, cnt, label, hexmsg))
     seen = {}
@@ -770,6 +733,8 @@ def report(area, stats, show, complete, rule_text):
         if seen.get(k, 0) < max(1, show // 4):
             seen[k] = seen.get(k, 0) + 1
             lines.append('  FAIL %s %s: %s\n      %s' % (what, label, text, hexmsg))
+    lines.append('PASSED (%s)' % title if not bad else 'FAILED (%s): %d disagreements'
+                 % (title, bad))
     return lines, bad
 
 

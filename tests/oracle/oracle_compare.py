@@ -1,31 +1,24 @@
 #!/usr/bin/env python3
 """Compare dpx-decode with an independent reference decoder (tshark).
 
-Builds TCAP/CAMEL messages with capgen.py, decodes them with the reference
-wrapper oracle.py (tshark) and with `dpx-decode --format json --pass md`,
-and checks that both agree on the message-level and component-level values:
-message type, transaction ids, P-Abort cause, dialogue PDU, application
-context name, dialogue result, abort source, and per component its type,
-invoke id, linked id, operation code, error code and reject problem.
+Three message sets, each decoded by tshark (through oracle.py) and by
+`dpx-decode --format json`:
 
-Our decoder follows its own rules where they differ from tshark (messages
-and dialogue [0] wrappers are read with definite lengths only, an
-indefinite-length component portion holds at most one component of each
-kind, a component list ends at a component it does not know, application
-contexts are read arc by arc only down to the CAP generation for CAP v4,
-...).  The expectation for each message is therefore tshark's value
-adjusted by those rules, worked out from the message's own BER structure;
-every adjustment is counted and shown with an example in the summary.
+* TCAP messages of every type from capgen.py, definite and indefinite: the
+  message type, transaction ids, P-Abort cause, dialogue PDU, application
+  context name, dialogue result, abort source and, per component, its type,
+  invoke and linked ids, operation or error code and reject problem
+  (TCAP_VALUES: our field ids and the texts they must show).
+* malformed variants of them (capgen mutate), decoded with all four passes:
+  every pass returns 1, reports its bit spans inside the message, no crash.
+* the arguments, results and errors of the areas in areas.py, compared value
+  by value and checked for coverage (arguments.py).
 
-It also decodes malformed variants (capgen mutate) with all four passes and
-checks that every pass returns 1, that every reported bit span lies inside
-the message and that the decoder does not crash.
-
-The arguments, results and errors of the areas in areas.py (call control;
-charging, call gap and announcements; SMS; GPRS) are checked value by value
-against tshark on messages with random values, and every octet of each
-argument, result or error must lie in a reported field of a clean four-pass
-decode (arguments.py).
+Where our decoder follows its own rules (messages and dialogue [0] wrappers
+read with definite lengths only, an indefinite component portion holding at
+most one component of each kind, ...), the expected value is tshark's
+adjusted by the rule, worked out from the message's own BER structure; every
+rule is named and counted, and a named rule that no message needed fails.
 
 Exit status: 0 all agree, 1 disagreements or a crash, 77 skipped (the
 reference tools or tshark are missing).  Python 3 standard library only.
@@ -48,32 +41,25 @@ import arguments  # noqa: E402
 import areas  # noqa: E402
 
 SKIP = 77
+PER_GROUP = 1000    # TCAP messages per message type and length form
+MUTATIONS = 2000    # malformed messages
+PER_OP = 200        # argument messages per operation, result operation code and error code
 MSG_TYPES = ('begin', 'continue', 'end', 'abort', 'unidirectional')
 TYPE_BY_OCTET = {0x61: 'unidirectional', 0x62: 'begin', 0x64: 'end',
                  0x65: 'continue', 0x67: 'abort'}
 
-# Field ids of the decoded-field pass (see src/fields/field_table.h).
-F_MT = 3604
-F_OTID, F_DTID = 3653, 3656
-F_PABORT = 3659
-F_DIALOGUE_PDU = 3760          # structured dialogue: the PDU's identifier octet
-F_UNI_DIALOGUE_TAG = 3728      # unidirectional dialogue tag (AUDT)
-F_RESULT = 3774
-F_ABORT_SOURCE = 3785
-ACN_ARCS = (3793, 3794, 3795, 3796, 3797)          # 0.4 / 0 / 0 / 1 / cap
+# Field ids of the decoded-field pass (see src/fields/field_table.h) that
+# are not compared values (TCAP_VALUES): the application context name's
+# arcs (0.4 / 0 / 0 / 1 / cap, then one of three tails), the components and
+# the problem codes under their problem type.
+ACN_ARCS = (3793, 3794, 3795, 3796, 3797)
 ACN_TAILS = ((3799, 3800), (3877, 3878), (3879, 3880))
-F_INVOKE, F_RESULT_LAST, F_ERROR, F_REJECT = 3660, 3669, 3685, 3694
-F_INVOKE_ID, F_LINKED_ID = 3705, 3708
-F_OPCODE, F_RESULT_OPCODE, F_ERROR_CODE = 1066, 1068, 1070
-F_PROBLEM_TYPE = 3701
-
+COMPONENT_BY_FIELD = {3660: 'invoke', 3669: 'returnResultLast', 3685: 'returnError',
+                      3694: 'reject'}
 PROBLEM_CODE_FIELDS = {3710: 0x80, 3712: 0x81, 3714: 0x82, 3716: 0x83}
-
-COMPONENT_BY_FIELD = {F_INVOKE: 'invoke', F_RESULT_LAST: 'returnResultLast',
-                      F_ERROR: 'returnError', F_REJECT: 'reject'}
+SCALARS = ('type', 'otid', 'dtid', 'p_abort', 'dialogue', 'acn', 'result', 'abort_source')
 COMPONENT_BY_TAG = {0xA1: 'invoke', 0xA2: 'returnResultLast',
                     0xA3: 'returnError', 0xA4: 'reject'}
-COMPONENT_ORDER = (0xA1, 0xA2, 0xA3, 0xA4)
 PROBLEM_KIND = {0x80: 'general', 0x81: 'invoke', 0x82: 'returnResult',
                 0x83: 'returnError'}
 DIALOGUE_BY_OCTET = {0x60: 'aarq', 0x61: 'aare', 0x64: 'abrt'}
@@ -124,143 +110,81 @@ class Disagreement(Exception):
 
 
 # --------------------------------------------------------------------------
-# BER structure of a generated message (well-formed by construction)
-# --------------------------------------------------------------------------
-class Node:
-    __slots__ = ('tag', 'off', 'indef', 'cstart', 'cend', 'end', 'kids')
-
-    def content(self, data):
-        return data[self.cstart:self.cend]
-
-    def kid(self, tag):
-        for k in self.kids:
-            if k.tag == tag:
-                return k
-        return None
-
-
-def parse_node(data, pos):
-    """One BER element at pos -> Node (children parsed for constructed ones)."""
-    n = Node()
-    n.off = pos
-    first = data[pos]
-    p = pos + 1
-    if first & 0x1F == 0x1F:
-        while data[p] & 0x80:
-            p += 1
-        p += 1
-        n.tag = int.from_bytes(data[pos:p], 'big')
-    else:
-        n.tag = first
-    lb = data[p]
-    p += 1
-    n.indef = lb == 0x80
-    if n.indef:
-        length = None
-    elif lb & 0x80:
-        cnt = lb & 0x7F
-        length = int.from_bytes(data[p:p + cnt], 'big')
-        p += cnt
-    else:
-        length = lb
-    n.cstart = p
-    n.kids = []
-    if first & 0x20:
-        q = p
-        while (q < p + length) if length is not None else not (data[q] == 0 and data[q + 1] == 0):
-            k = parse_node(data, q)
-            n.kids.append(k)
-            q = k.end
-        n.cend = q
-        n.end = q + 2 if length is None else q
-    else:
-        n.cend = p + length
-        n.end = n.cend
-    if n.end > len(data):
-        raise ValueError('element at %d runs past the message' % pos)
-    return n
-
-
-# --------------------------------------------------------------------------
 # Our decoder's output -> summary
 # --------------------------------------------------------------------------
+DIGITS, NUMBER, OPCODE = 'digits', 'number', 'opcode'
+# The compared fields of the decoded-field pass: field id -> value, message
+# or component level, how its text is checked (DIGITS: the text after '='
+# gives the spans' half-octets; NUMBER: the text after '=' is the value;
+# OPCODE: named exactly when the code is in our table; (prefix, names):
+# the text is the prefix and the value's name) and the names of the octet
+# kept as the value (None: the octet itself; DIGITS: the text's digits).
+TCAP_VALUES = {
+    3604: ('type', 'message', None, TYPE_BY_OCTET),
+    3653: ('otid', 'message', DIGITS, DIGITS),
+    3656: ('dtid', 'message', DIGITS, DIGITS),
+    3659: ('p_abort', 'message', ('  P-Abort Cause=', PABORT_NAMES), None),
+    3760: ('dialogue', 'message', ('  Dialogue PDU=', DIALOGUE_NAMES), DIALOGUE_BY_OCTET),
+    3728: ('dialogue', 'message', None, {0x60: 'audt'}),      # unidirectional dialogue (AUDT)
+    3774: ('result', 'message', ('  Result=', RESULT_NAMES), None),
+    3785: ('abort_source', 'message', ('  Abort Source Value=', ABORT_SOURCE_NAMES), None),
+    3705: ('invoke_id', 'component', NUMBER, None),
+    3708: ('linked_id', 'component', NUMBER, None),
+    1066: ('opcode', 'component', OPCODE, None),
+    1068: ('opcode', 'component', None, None),                # Return Result's operation code
+    1070: ('error_code', 'component', None, None),
+    3701: ('problem_type', 'component', ('  Problem Code=', PROBLEM_TYPE_NAMES), None),
+}
+
+
 def after_eq(text):
     return text.split('=', 1)[1] if '=' in text else None
+
+
+def text_ok(f, v, check):
+    text = f['text']
+    if check == DIGITS:
+        return after_eq(text) == ''.join('%x' % sp[2] for sp in f['spans'])
+    if check == NUMBER:
+        return after_eq(text) == str(v)
+    if check == OPCODE:
+        return text.startswith('Operation ID(Invoke)=') and \
+            bool(after_eq(text)) == (v in NAMED_OPCODES)
+    return check is None or text == check[0] + check[1].get(v, '')
 
 
 def summarize_ours(md):
     """Values of the compared fields from one decoded-field pass.  Problems
     with the rendering (text that does not match the value) go to 'texts'."""
-    s = {'type': None, 'otid': None, 'dtid': None, 'p_abort': None, 'dialogue': None,
-         'result': None, 'abort_source': None, 'acn': None, 'components': [],
-         'texts': []}
-    arcs = {}
-    comp = None
-
-    def check_name(f, value, names, prefix):
-        want = names.get(value, '')
-        if f['text'] != prefix + want:
-            s['texts'].append('field %d value %d shown %r, expected %r'
-                              % (f['id'], value, f['text'], prefix + want))
-
-    def set_once(d, key, value, fid):
-        if d.get(key) is not None:
-            s['texts'].append('field %d reported twice in one %s'
-                              % (fid, 'component' if d is comp else 'message'))
-        d[key] = value
-
+    s = dict.fromkeys(SCALARS)
+    s.update(components=[], texts=[])
+    arcs, comp = {}, None
     for f in md.get('fields', []):
         fid = f['id']
-        spans = f.get('spans') or []
-        v = spans[0][2] if spans else None
-        if fid == F_MT:
-            s['type'] = TYPE_BY_OCTET.get(v, 'octet %02x' % v)
-        elif fid in (F_OTID, F_DTID):
-            digits = after_eq(f['text'])
-            from_spans = ''.join('%x' % sp[2] for sp in spans)
-            if digits != from_spans:
-                s['texts'].append('field %d text %r, spans give %r' % (fid, f['text'], from_spans))
-            set_once(s, 'otid' if fid == F_OTID else 'dtid', digits, fid)
-        elif fid == F_PABORT:
-            check_name(f, v, PABORT_NAMES, '  P-Abort Cause=')
-            set_once(s, 'p_abort', v, fid)
-        elif fid == F_DIALOGUE_PDU:
-            check_name(f, v, DIALOGUE_NAMES, '  Dialogue PDU=')
-            set_once(s, 'dialogue', DIALOGUE_BY_OCTET.get(v, 'octet %02x' % v), fid)
-        elif fid == F_UNI_DIALOGUE_TAG:
-            set_once(s, 'dialogue', 'audt' if v == 0x60 else 'octet %02x' % v, fid)
-        elif fid == F_RESULT:
-            check_name(f, v, RESULT_NAMES, '  Result=')
-            set_once(s, 'result', v, fid)
-        elif fid == F_ABORT_SOURCE:
-            check_name(f, v, ABORT_SOURCE_NAMES, '  Abort Source Value=')
-            set_once(s, 'abort_source', v, fid)
-        elif fid in ACN_ARCS or any(fid in t for t in ACN_TAILS):
-            arcs[fid] = v
-        elif fid in COMPONENT_BY_FIELD:
+        v = f['spans'][0][2] if f.get('spans') else None
+        if fid in COMPONENT_BY_FIELD:
             comp = {'type': COMPONENT_BY_FIELD[fid]}
             s['components'].append(comp)
-        elif comp is None:
             continue
-        elif fid in (F_INVOKE_ID, F_LINKED_ID):
-            if after_eq(f['text']) != str(v):
-                s['texts'].append('field %d value %d shown %r' % (fid, v, f['text']))
-            set_once(comp, 'invoke_id' if fid == F_INVOKE_ID else 'linked_id', v, fid)
-        elif fid == F_OPCODE:
-            name = after_eq(f['text'])
-            if not f['text'].startswith('Operation ID(Invoke)=') or \
-                    bool(name) != (v in NAMED_OPCODES):
-                s['texts'].append('operation %d shown %r' % (v, f['text']))
-            set_once(comp, 'opcode', v, fid)
-        elif fid == F_RESULT_OPCODE:
-            set_once(comp, 'opcode', v, fid)
-        elif fid == F_ERROR_CODE:
-            set_once(comp, 'error_code', v, fid)
-        elif fid == F_PROBLEM_TYPE:
-            check_name(f, v, PROBLEM_TYPE_NAMES, '  Problem Code=')
-            set_once(comp, 'problem_type', v, fid)
-        elif fid in PROBLEM_CODE_FIELDS:
-            set_once(comp, 'problem_code', (PROBLEM_CODE_FIELDS[fid], v), fid)
+        if fid in ACN_ARCS or any(fid in t for t in ACN_TAILS):
+            arcs[fid] = v
+            continue
+        if fid in PROBLEM_CODE_FIELDS:
+            key, where, value = 'problem_code', 'component', (PROBLEM_CODE_FIELDS[fid], v)
+        elif fid in TCAP_VALUES:
+            key, where, check, names = TCAP_VALUES[fid]
+            if not text_ok(f, v, check):
+                s['texts'].append('field %d value %r shown %r' % (fid, v, f['text']))
+            value = after_eq(f['text']) if names == DIGITS else \
+                v if names is None else names.get(v, 'octet %02x' % v)
+        else:
+            continue
+        target = s if where == 'message' else comp
+        if target is None:
+            continue
+        if target.get(key) is not None:
+            s['texts'].append('field %d reported twice in one %s' % (fid, where))
+        target[key] = value
     for c in s['components']:
         pt, pc = c.pop('problem_type', None), c.pop('problem_code', None)
         if pc is not None and pc[0] != pt:
@@ -270,16 +194,8 @@ def summarize_ours(md):
         elif pt is not None or pc is not None:
             c['problem'] = 'type %r code %r' % (pt, pc and pc[1])
     if arcs:
-        parts = []
-        if 3793 in arcs:
-            parts += [str(arcs[3793] // 40), str(arcs[3793] % 40)]
-        for fid in ACN_ARCS[1:]:
-            if fid in arcs:
-                parts.append(str(arcs[fid]))
-        for a, b in ACN_TAILS:
-            for fid in (a, b):
-                if fid in arcs:
-                    parts.append(str(arcs[fid]))
+        parts = [str(arcs[3793] // 40), str(arcs[3793] % 40)] if 3793 in arcs else []
+        parts += [str(arcs[fid]) for fid in ACN_ARCS[1:] + sum(ACN_TAILS, ()) if fid in arcs]
         s['acn'] = '.'.join(parts)
     return s
 
@@ -356,7 +272,7 @@ def component_expectations(cp, ora_comps, e, notes):
                 break
     else:
         pos = 0
-        for kind in COMPONENT_ORDER:
+        for kind in COMPONENT_BY_TAG:
             if pos >= len(kids) or kids[pos].tag != kind:
                 continue
             decoded.append(kids[pos])
@@ -426,7 +342,6 @@ def tcap_rules(data, root, ora):
 # --------------------------------------------------------------------------
 # Comparison
 # --------------------------------------------------------------------------
-SCALARS = ('type', 'otid', 'dtid', 'p_abort', 'dialogue', 'acn', 'result', 'abort_source')
 COMPONENT_KEYS = ('type', 'invoke_id', 'linked_id', 'opcode', 'error_code', 'problem')
 
 
@@ -435,7 +350,7 @@ def compare(index, group, hexmsg, ora, ours, stats):
     notes = set()
     problems = []
     try:
-        root = parse_node(data, 0)
+        root = arguments.parse_message(data)
         if ora.get('error'):
             raise Disagreement('oracle: %s' % ora['error'])
         exp = expect(data, root, ora, notes)
@@ -444,9 +359,6 @@ def compare(index, group, hexmsg, ora, ours, stats):
         return
     for n in notes:
         stats.rule(n, hexmsg)
-    if not notes:
-        fl = stats.flags.setdefault(ours.get('errorFlags'), [0, hexmsg])
-        fl[0] += 1
     if ours.get('result') != 1:
         problems.append('md pass result %r' % ours.get('result'))
     got = summarize_ours(ours)
@@ -454,13 +366,8 @@ def compare(index, group, hexmsg, ora, ours, stats):
         stats.count('value names', False)
         problems.append(t)
     for key in SCALARS:
-        want, have = exp[key], got[key]
-        if want is None and have is None:
-            continue
-        ok = want == have
-        stats.count(key, ok)
-        if not ok:
-            problems.append('%s: ours %r, expected %r' % (key, have, want))
+        if exp[key] is not None or got[key] is not None:
+            stats.value(key, exp[key], got[key], group, hexmsg)
     wc, hc = exp['components'], got['components']
     n_ok = len(hc) == len(wc) or (exp['extra_components_ok'] and len(hc) > len(wc))
     if wc or hc:
@@ -468,15 +375,10 @@ def compare(index, group, hexmsg, ora, ours, stats):
     if not n_ok:
         problems.append('components: ours %d %s, expected %d %s'
                         % (len(hc), [c['type'] for c in hc], len(wc), [c['type'] for c in wc]))
-    for i, (w, h) in enumerate(zip(wc, hc)):
+    for w, h in zip(wc, hc):
         for key in COMPONENT_KEYS:
-            if key not in w and key not in h:
-                continue
-            ok = w.get(key) == h.get(key)
-            stats.count('component ' + key, ok)
-            if not ok:
-                problems.append('component %d %s: ours %r, expected %r'
-                                % (i, key, h.get(key), w.get(key)))
+            if key in w or key in h:
+                stats.value('component ' + key, w.get(key), h.get(key), group, hexmsg)
     for p in problems:
         stats.failures.append((index, group, p, hexmsg))
 
@@ -522,42 +424,53 @@ def build_mutations(capgen, corpus, count, seed):
 # --------------------------------------------------------------------------
 # Running the decoders
 # --------------------------------------------------------------------------
-def write_hex(path, msgs):
-    with open(path, 'w') as f:
-        for _, h in msgs:
-            f.write(h + '\n')
+def check_mutated(mutated, outputs, stats):
+    """Every pass returns 1 on a malformed message (the key-field pass may
+    return 0 for a key value too long for its slot) and reports bit spans
+    and remaining bits inside it."""
+    for i, ((why, hexmsg), o) in enumerate(zip(mutated, outputs)):
+        nbits = len(hexmsg) // 2 * 8
+        problems = []
+        for p in arguments.PASSES:
+            out = o.get(p) or {}
+            ok = out.get('result') == 1
+            if p == 'keys' and out.get('result') == 0 and \
+                    any(k.get('overflow') for k in out.get('entries', [])):
+                ok = True
+                stats.rule('key-overflow', hexmsg)
+            stats.count('mutated: %s result 1' % p, ok)
+            if not ok:
+                problems.append('%s pass result %r' % (p, out.get('result')))
+            if not 0 <= (out.get('remainingBits') or 0) <= nbits:
+                problems.append('%s pass remainingBits %r' % (p, out['remainingBits']))
+        bad = [(f['id'], sp) for f in (o.get('md') or {}).get('fields', [])
+               for sp in f.get('spans') or [] if not 1 <= sp[0] <= sp[1] <= nbits]
+        stats.count('mutated: spans inside the message', not bad)
+        problems += ['field %d span %r outside bits 1..%d' % (b[0], b[1], nbits) for b in bad[:1]]
+        stats.failures += [('m%d' % i, 'mutated ' + why, p, hexmsg) for p in problems]
+
+
+def run(jobs):
+    """Runs the (command, file taking its standard output or None) jobs side
+    by side; -> what went wrong in those that failed."""
+    procs = []
+    for cmd, out in jobs:
+        f = open(out, 'w') if out else subprocess.DEVNULL
+        procs.append((cmd, f, subprocess.Popen(cmd, stdout=f, stderr=subprocess.PIPE, text=True)))
+    crashed = []
+    for cmd, f, p in procs:
+        _, err = p.communicate()
+        if f is not subprocess.DEVNULL:
+            f.close()
+        if p.returncode != 0:
+            crashed.append('%s exited with %d%s' % (' '.join(cmd), p.returncode,
+                                                    (':\n' + err.strip()[-3000:]) if err else ''))
+    return crashed
 
 
 def read_jsonl(path):
     with open(path) as f:
         return [json.loads(line) for line in f if line.strip()]
-
-
-def check_mutated(mutated, outputs, stats):
-    passes = ('md', 'display', 'view', 'keys')
-    for i, ((why, hexmsg), o) in enumerate(zip(mutated, outputs)):
-        nbits = len(hexmsg) // 2 * 8
-        for p in passes:
-            r = (o.get(p) or {}).get('result')
-            ok = r == 1
-            if p == 'keys' and r == 0 and any(k.get('overflow') for k in o[p].get('entries', [])):
-                # A key value that does not fit its slot ends the key-field
-                # pass with 0: that is the pass's answer, not a fault.
-                ok = True
-                stats.rule('key-overflow', hexmsg)
-            stats.count('mutated: %s result 1' % p, ok)
-            if not ok:
-                stats.failures.append(('m%d' % i, 'mutated ' + why, '%s pass result %r' % (p, r), hexmsg))
-            rem = (o.get(p) or {}).get('remainingBits')
-            if rem is not None and not 0 <= rem <= nbits:
-                stats.failures.append(('m%d' % i, 'mutated ' + why,
-                                       '%s pass remainingBits %r' % (p, rem), hexmsg))
-        bad = [(f['id'], sp) for f in (o.get('md') or {}).get('fields', [])
-               for sp in f.get('spans') or [] if not 1 <= sp[0] <= sp[1] <= nbits]
-        stats.count('mutated: spans inside the message', not bad)
-        if bad:
-            stats.failures.append(('m%d' % i, 'mutated ' + why, 'field %d span %r outside bits 1..%d'
-                                   % (bad[0][0], bad[0][1], nbits), hexmsg))
 
 
 def main(argv=None):
@@ -569,25 +482,15 @@ def main(argv=None):
     ap.add_argument('--tools', default=os.environ.get('DPX_REFERENCE_TOOLS',
                                                       str(repo.parent / 'shared' / 'tools')),
                     help='folder holding capgen.py and oracle.py')
-    ap.add_argument('--tshark', default='tshark')
-    ap.add_argument('--per-group', type=int, default=1000,
-                    help='messages per message type and length form (default 1000)')
-    ap.add_argument('--mutations', type=int, default=2000,
-                    help='malformed messages decoded with all passes (default 2000)')
-    ap.add_argument('--per-op', type=int, default=200,
-                    help='messages per call-control, charging, SMS or GPRS operation, result '
-                         'operation code and error code (default 200)')
     ap.add_argument('--seed', type=int, default=29078)
-    ap.add_argument('--show', type=int, default=20, help='disagreements listed (default 20)')
-    ap.add_argument('--keep', help='keep the generated and decoded files in this folder')
     args = ap.parse_args(argv)
 
     tools = Path(args.tools)
     if not (tools / 'capgen.py').is_file() or not (tools / 'oracle.py').is_file():
         print('SKIPPED: reference tools not found in %s' % tools)
         return SKIP
-    if shutil.which(args.tshark) is None:
-        print('SKIPPED: tshark not found (%s)' % args.tshark)
+    if shutil.which('tshark') is None:
+        print('SKIPPED: tshark not found')
         return SKIP
     if not os.access(args.decoder, os.X_OK):
         print('FAILED: decoder %s not found' % args.decoder)
@@ -598,122 +501,71 @@ def main(argv=None):
     arguments.init(capgen)
 
     started = time.time()
-    corpus = build_corpus(capgen, args.per_group, args.seed)
-    mutated = build_mutations(capgen, corpus, args.mutations, args.seed)
-    # The argument areas and their messages, decoded in one run of each decoder
+    corpus = build_corpus(capgen, PER_GROUP, args.seed)
+    mutated = build_mutations(capgen, corpus, MUTATIONS, args.seed)
     suites = []
     for area in areas.AREAS:
-        area.update(types=areas.TYPES, rows=arguments.read_rows(areas.VALUES, area['letter']),
-                    rules=area['rules'].split())
-        suites.append((area, arguments.build_corpus(area, args.per_op, args.seed)))
-    arg_corpus = [m for _, c in suites for m in c]
+        area.update(types=areas.TYPES, rows=arguments.read_rows(areas.VALUES, area['letter']))
+        suites.append((area, arguments.build_corpus(area, PER_OP, args.seed)))
 
-    work = Path(args.keep) if args.keep else Path(tempfile.mkdtemp(prefix='oracle_compare.'))
-    work.mkdir(parents=True, exist_ok=True)
+    work = Path(tempfile.mkdtemp(prefix='oracle_compare.'))
     try:
-        # the reference reads each area's messages in a process of its own
-        parts = [area['name'].replace(' ', '_') + '.' for area, _ in suites]
-        f = {k: work / k for k in ['corpus.txt', 'mutated.txt', 'oracle.jsonl', 'ours.jsonl',
-                                   'mutated.jsonl', 'arguments.ours.jsonl'] +
-             [a + k for a in parts for k in ('txt', 'oracle.jsonl', 'pdml')]}
-        for name, msgs in [('corpus.txt', corpus), ('mutated.txt', mutated)] + \
-                [(a + 'txt', c) for a, (_, c) in zip(parts, suites)]:
-            write_hex(f[name], msgs)
-        reference = [sys.executable, str(tools / 'oracle.py'), '--jsonl', '-q', '--no-hex',
-                     '--tshark', args.tshark]
-        json_out = decoder + ['--format', 'json', '--pass']
-        jobs = [  # command, file taking its standard output
-            (reference + [str(f['corpus.txt']), '-o', str(f['oracle.jsonl'])], None),
-            (json_out + ['md', str(f['corpus.txt'])], f['ours.jsonl']),
-            (json_out + ['md,display,view,keys', str(f['mutated.txt'])], f['mutated.jsonl']),
-            (json_out + ['md,display,view,keys'] + [str(f[a + 'txt']) for a in parts],
-             f['arguments.ours.jsonl'])] + [
-            (reference + [str(f[a + 'txt']), '-o', str(f[a + 'oracle.jsonl']),
-                          '--pdml', str(f[a + 'pdml'])], None) for a in parts]
-        procs = [(cmd, open(out, 'w') if out else subprocess.DEVNULL) for cmd, out in jobs]
-        procs = [(cmd, subprocess.Popen(cmd, stdout=out, stderr=subprocess.PIPE, text=True), out)
-                 for cmd, out in procs]
-        crashed = []
-        for cmd, p, out in procs:
-            _, err = p.communicate()
-            if out is not subprocess.DEVNULL:
-                out.close()
-            if p.returncode != 0:
-                crashed.append('%s exited with %d%s' % (' '.join(cmd), p.returncode,
-                                                        (':\n' + err.strip()[-3000:]) if err else ''))
+        # the reference reads each area's messages in a process of its own;
+        # ours decodes all argument messages in one run
+        names = ['tcap', 'mutated'] + [area['name'].replace(' ', '_') for area, _ in suites]
+        for name, msgs in zip(names, [corpus, mutated] + [c for _, c in suites]):
+            with open(work / (name + '.txt'), 'w') as f:
+                f.write(''.join(h + '\n' for _, h in msgs))
+        reference = [sys.executable, str(tools / 'oracle.py'), '--jsonl', '-q', '--no-hex']
+        ours = decoder + ['--format', 'json', '--pass']
+        txt = [str(work / (n + '.txt')) for n in names]
+        crashed = run([(reference + [txt[0], '-o', str(work / 'tcap.oracle.jsonl')], None),
+                       (ours + ['md', txt[0]], work / 'tcap.ours.jsonl'),
+                       (ours + ['md,display,view,keys', txt[1]], work / 'mutated.ours.jsonl'),
+                       (ours + ['md,display,view,keys'] + txt[2:], work / 'arguments.ours.jsonl')] +
+                      [(reference + [txt[i], '-o', str(work / (n + '.oracle.jsonl')), '--pdml',
+                                     str(work / (n + '.pdml'))], None)
+                       for i, n in enumerate(names) if i >= 2])
         if crashed:
             print('FAILED:\n' + '\n'.join(crashed))
             return 1
-        oracle, ours, mut = (read_jsonl(f[k]) for k in ('oracle.jsonl', 'ours.jsonl',
-                                                        'mutated.jsonl'))
-        arg_outputs = ([x for a in parts for x in arguments.read_pdml(f[a + 'pdml'])],
-                       [x for a in parts for x in read_jsonl(f[a + 'oracle.jsonl'])],
-                       read_jsonl(f['arguments.ours.jsonl']))
-        counts = [len(oracle), len(ours), len(mut)] + [len(x) for x in arg_outputs]
-        if counts != [len(corpus)] * 2 + [len(mutated)] + [len(arg_corpus)] * 3:
-            print('FAILED: output counts (oracle, ours, mutated, tshark, oracle and ours of the '
-                  'arguments): %s of %d, %d, %d' % (counts, len(corpus), len(mutated),
-                                                    len(arg_corpus)))
-            return 1
+        outputs = [read_jsonl(work / (n + '.jsonl')) for n in ('tcap.oracle', 'tcap.ours',
+                                                                'mutated.ours')]
+        arg_outputs = ([x for n in names[2:] for x in arguments.read_pdml(work / (n + '.pdml'))],
+                       [x for n in names[2:] for x in read_jsonl(work / (n + '.oracle.jsonl'))],
+                       read_jsonl(work / 'arguments.ours.jsonl'))
     finally:
-        if not args.keep:
-            shutil.rmtree(work, ignore_errors=True)
+        shutil.rmtree(work, ignore_errors=True)
+    n_args = sum(len(c) for _, c in suites)
+    counts = [len(x) for x in outputs + list(arg_outputs)]
+    if counts != [len(corpus)] * 2 + [len(mutated)] + [n_args] * 3:
+        print('FAILED: output counts (tshark and ours of the TCAP messages, ours of the '
+              'malformed, tshark\'s PDML and summary and ours of the arguments): %s of %d, %d, %d'
+              % (counts, len(corpus), len(mutated), n_args))
+        return 1
+
     stats = arguments.Stats()
-    stats.flags = {}        # error flags of messages no rule adjusts -> [count, hex]
-    for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, oracle, ours)):
+    for i, ((group, hexmsg), o, u) in enumerate(zip(corpus, *outputs[:2])):
         compare(i, group, hexmsg, o, u.get('md') or {}, stats)
-    check_mutated(mutated, mut, stats)
-    suite_stats, first = [], 0
+    check_mutated(mutated, outputs[2], stats)
+    print('oracle_compare: %d TCAP messages and %d argument messages compared with tshark, %d '
+          'malformed messages decoded with all passes, %.1f s'
+          % (len(corpus), n_args, len(mutated), time.time() - started))
+    # every TCAP rule but key-overflow (malformed messages only) must be needed
+    lines, bad = arguments.report('TCAP messages, components and malformed messages', stats,
+                                  (), [r for r in RULE_TEXT if r != 'key-overflow'], RULE_TEXT)
+    first = 0
     for area, suite_corpus in suites:
         part = [x[first:first + len(suite_corpus)] for x in arg_outputs]
         first += len(suite_corpus)
-        suite_stats.append(arguments.check(area, suite_corpus, *part, parse_node, tcap_rules))
-
-    if args.per_group >= 1000:      # large enough that every rule must have been needed
-        stats.failures += [('-', 'rules', 'RULE NEVER APPLIED %s: no message needed it' % r, '')
-                           for r in RULE_TEXT if r not in stats.rules and r != 'key-overflow']
-    report(stats, len(corpus), len(mutated), time.time() - started, args.show)
-    bad = 0
-    for (area, suite_corpus), suite in zip(suites, suite_stats):
-        lines, suite_bad = arguments.report(area, suite, args.show, args.per_op >= 200,
-                                            areas.RULE_TEXT)
-        print('%d %s messages (%d operations%s) compared with tshark and decoded with all passes'
-              % (len(suite_corpus), area['name'], len(area['ops']), ', %d result operation '
-                 'codes, every error code' % len(area['results']) if 'results' in area else ''))
-        print('\n'.join(lines))
-        print('PASSED (%s)' % area['name'] if not suite_bad else
-              'FAILED (%s): %d disagreements' % (area['name'], suite_bad))
-        bad += suite_bad
-    return 1 if stats.failures or bad else 0
-
-
-def report(stats, n, n_mut, seconds, show):
-    print('oracle_compare: %d generated messages compared with tshark, %d malformed '
-          'messages decoded with all passes, %.1f s' % (n, n_mut, seconds))
-    print('agreement (values compared where tshark or our rules give one):')
-    for key in sorted(stats.compared):
-        c, a = stats.compared[key]
-        print('  %-34s %6d / %-6d%s' % (key, a, c, '' if a == c else '  <-- %d differ' % (c - a)))
-    if stats.rules:
-        print('rule-aware adjustments (our rules, tshark differs; messages, example):')
-        for key in sorted(stats.rules):
-            cnt, ex = stats.rules[key]
-            print('  %-32s %6d  %s' % (key, cnt, RULE_TEXT.get(key, '')))
-            print('  %32s         e.g. %s' % ('', ex if len(ex) <= 120 else ex[:117] + '...'))
-    if stats.flags:
-        print('error flags of the messages no rule adjusts (information only):')
-        for fl in sorted(stats.flags, key=lambda x: (x is None, x or 0)):
-            cnt, ex = stats.flags[fl]
-            print('  %-10s %6d  e.g. %s' % ('none' if fl is None else '0x%x' % fl, cnt,
-                                             ex if len(ex) <= 100 else ex[:97] + '...'))
-    if not stats.failures:
-        print('PASSED')
-        return
-    msgs = len({f[0] for f in stats.failures})
-    print('FAILED: %d disagreements in %d messages; first %d:'
-          % (len(stats.failures), msgs, min(show, len(stats.failures))))
-    for index, group, what, hexmsg in stats.failures[:show]:
-        print('  #%s [%s] %s\n      %s' % (index, group, what, hexmsg))
+        area_lines, area_bad = arguments.report(
+            area['title'], arguments.check(area, suite_corpus, *part, tcap_rules),
+            [r[0] for r in area['rows']], area['rules'].split(),
+            areas.RULE_TEXT)
+        lines += area_lines
+        bad += area_bad
+    print('\n'.join(lines))
+    return 1 if bad else 0
 
 
 if __name__ == '__main__':

@@ -7,6 +7,7 @@
 #include <nlohmann/json.hpp>
 #include <sys/wait.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <fstream>
 #include <sstream>
@@ -46,6 +47,75 @@ TEST(DpxDecodeKeys, PresentEntriesAreReadInTheirStoredFormWithinTheBuffer) {
                       (e.overflow ? " overflow" : ""));
     EXPECT_EQ(got, (Lines{"0:62/8", "17:/16", "20:1000/16", "21:/0 overflow", "26:ABC0/12", "29:01000004/64",
                           "30:/0"}));
+}
+
+// One key-entry vector read into again and again, as dpx-decode's session
+// does: a message with fewer or shorter entries shows nothing of the one
+// before.
+TEST(DpxDecodeKeys, AReusedEntryListHoldsOnlyTheLastBuffersEntries) {
+    std::vector<uint8_t> many(512, 0), few(512, 0);
+    const auto mark = [](std::vector<uint8_t> &buf, uint32_t entry, std::vector<uint8_t> slot) {
+        buf[entry / 8] |= uint8_t(1u << (entry % 8));
+        std::copy(slot.begin(), slot.end(), buf.begin() + HOST_KEY_SLOT_BASE + 4 * entry);
+    };
+    mark(many, 0, {0x65});
+    mark(many, 17, {64, 0, 200, 0}); // 16 hex digits: longer than a short string holds
+    mark(many, 21, {0, 0, 0x2C, 0x81});
+    mark(many, 26, {32, 0, 208, 0});
+    for (int i = 0; i < 12; ++i)
+        many[200 + i] = uint8_t(0x11 * (i + 1));
+    mark(few, 17, {8, 0, 128, 0});
+    few[128] = 0x5A;
+    const auto show = [](const std::vector<dpxdecode::KeyEntryOut> &entries) {
+        Lines got;
+        for (const auto &e : entries)
+            got.push_back(std::to_string(e.index) + ":" + e.value + "/" + std::to_string(e.bits) +
+                          (e.overflow ? " overflow" : ""));
+        return got;
+    };
+    std::vector<dpxdecode::KeyEntryOut> entries;
+    dpxdecode::readKeyEntries(many.data(), 512, entries);
+    EXPECT_EQ(show(entries), (Lines{"0:65/8", "17:1122334455667788/64", "21:/0 overflow", "26:99AABBCC/32"}));
+    dpxdecode::readKeyEntries(few.data(), 512, entries);
+    EXPECT_EQ(show(entries), (Lines{"17:5A/8"}));
+    dpxdecode::readKeyEntries(many.data(), 512, entries);
+    EXPECT_EQ(show(entries), show(dpxdecode::readKeyEntries(many.data(), 512)));
+}
+
+// One HexLine parsed into line after line: each result is that line's
+// alone, whatever the line before held.
+TEST(DpxDecodeHexLine, AReusedLineHoldsOnlyTheLastLinesMessageOrError) {
+    struct Case {
+        const char *line;
+        dpxdecode::LineKind kind;
+        const char *hexOrError;
+    };
+    using K = dpxdecode::LineKind;
+    const Case cases[] = {
+        {"62 0A:48 04\t0102A3fF 6B00  # comment 99", K::Message, "620A480401 02A3FF6B00"},
+        {"a1", K::Message, "A1"},
+        {"  # only a comment", K::Empty, ""},
+        {"0102 030", K::Bad, "odd number of hex digits (7)"},
+        {"\r", K::Empty, ""},
+        {"01 02 0g", K::Bad, "bad character 'g' at column 8"},
+        {"00\x01", K::Bad, "bad character byte 0x01 at column 3"},
+        {"F0:0F", K::Message, "F00F"},
+    };
+    dpxdecode::HexLine l;
+    for (const Case &c : cases) {
+        SCOPED_TRACE(c.line);
+        dpxdecode::parseHexLine(c.line, l);
+        EXPECT_EQ(l.kind, c.kind);
+        std::string want = c.hexOrError;
+        if (c.kind == K::Bad) {
+            EXPECT_EQ(l.error, want);
+            EXPECT_TRUE(l.bytes.empty());
+        } else {
+            want.erase(std::remove(want.begin(), want.end(), ' '), want.end());
+            EXPECT_EQ(dpxdecode::toHex(l.bytes), want);
+            EXPECT_EQ(l.error, "");
+        }
+    }
 }
 
 using dpxtest::Outcome;
@@ -90,6 +160,40 @@ TEST(DpxDecodeRun, JsonOfTheSamplesFollowsTheSchema) {
     EXPECT_EQ(o["keys"]["entries"][1],
               json::parse(
                   R"({"index":26,"name":"Originating Transaction Id","value":"01020304","bits":32,"text":"01020304"})"));
+}
+
+// The session reuses its state, key buffer and the host's records from
+// message to message: every message must decode as if it came first.  All
+// samples are run forward and backward, and each message's four passes
+// must agree between the two runs.
+TEST(DpxDecodeRun, EachMessageDecodesTheSameWhateverCameBefore) {
+    std::string forward;
+    std::vector<std::string> lines;
+    for (const char *name : {"messages", "malformed", "call_control", "charging", "gprs", "sms", "components",
+                             "dialogue", "results"}) {
+        std::ifstream in(std::string(DPX_SOURCE_DIR "/samples/") + name + ".txt");
+        for (std::string line; std::getline(in, line);)
+            if (dpxdecode::parseHexLine(line).kind == dpxdecode::LineKind::Message)
+                lines.push_back(line);
+    }
+    ASSERT_GE(lines.size(), 50u);
+    std::string backward;
+    for (size_t i = 0; i < lines.size(); ++i) {
+        forward += lines[i] + "\n";
+        backward += lines[lines.size() - 1 - i] + "\n";
+    }
+    const Outcome a = run("--format json -", forward);
+    const Outcome b = run("--format json -", backward);
+    ASSERT_EQ(a.status, b.status);
+    std::vector<json> first = a.objects(), second = b.objects();
+    ASSERT_EQ(first.size(), lines.size());
+    ASSERT_EQ(second.size(), lines.size());
+    for (size_t i = 0; i < lines.size(); ++i) {
+        json x = first[i], y = second[lines.size() - 1 - i];
+        x.erase("index");
+        y.erase("index");
+        EXPECT_EQ(x, y) << lines[i];
+    }
 }
 
 TEST(DpxDecodeRun, TextShowsFieldLinesVerdictAndKeys) {

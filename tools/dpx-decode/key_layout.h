@@ -82,29 +82,33 @@ inline const char *keyEntryName(uint32_t index) {
 
 inline uint16_t readLe16(const uint8_t *p) { return static_cast<uint16_t>(p[0] | p[1] << 8); }
 
-// Entries whose presence bit is set, in entry order.  Nothing outside
+// Entries whose presence bit is set, in entry order, into `out` (whose
+// entries keep their string capacity from call to call).  Nothing outside
 // buffer[0, size) is read: a value reaching past the buffer is cut at its
 // end.
-inline std::vector<KeyEntryOut> readKeyEntries(const uint8_t *buffer, uint32_t size) {
-    std::vector<KeyEntryOut> out;
+inline void readKeyEntries(const uint8_t *buffer, uint32_t size, std::vector<KeyEntryOut> &out) {
+    size_t count = 0;
     for (uint32_t i = 0; i < DPX_KEY_ENTRY_COUNT; ++i) {
         const uint32_t presence = i / 8;
         if (presence >= size || (buffer[presence] & (1u << (i % 8))) == 0)
             continue;
-        KeyEntryOut e;
+        if (count == out.size())
+            out.emplace_back();
+        KeyEntryOut &e = out[count++];
         e.index = i;
+        e.value.clear();
+        e.bits = 0;
+        e.overflow = false;
         const uint32_t slot = HOST_KEY_SLOT_BASE + HOST_KEY_SLOT_SIZE * i;
-        if (slot + HOST_KEY_SLOT_SIZE > size) {
-            out.push_back(e);
+        if (slot + HOST_KEY_SLOT_SIZE > size)
             continue;
-        }
         switch (keyEntryForm(i)) {
         case KeyForm::Octet:
-            e.value = toHex(buffer + slot, 1);
+            appendHex(e.value, buffer + slot, 1);
             e.bits = 8;
             break;
         case KeyForm::Word:
-            e.value = toHex(buffer + slot, 2);
+            appendHex(e.value, buffer + slot, 2);
             e.bits = 16;
             break;
         case KeyForm::Variable: {
@@ -117,14 +121,19 @@ inline std::vector<KeyEntryOut> readKeyEntries(const uint8_t *buffer, uint32_t s
             }
             const uint32_t want = (uint32_t{bits} + 7) / 8;
             const uint32_t have = offset < size ? size - offset : 0;
-            e.value = toHex(buffer + offset, want < have ? want : have);
+            appendHex(e.value, buffer + offset, want < have ? want : have);
             break;
         }
         case KeyForm::None:
             break;
         }
-        out.push_back(e);
     }
+    out.resize(count);
+}
+
+inline std::vector<KeyEntryOut> readKeyEntries(const uint8_t *buffer, uint32_t size) {
+    std::vector<KeyEntryOut> out;
+    readKeyEntries(buffer, size, out);
     return out;
 }
 

@@ -25,32 +25,24 @@ bool resolve(void *handle, const char *name, F &fn, std::string &error) {
     return true;
 }
 
+// The fields are views into the host's records; the vectors keep their
+// capacity from message to message, and their elements own nothing.
 void collectDecoded(MdOut &out) {
     const uint32_t n = host_DecodedCount();
-    // Resized, not cleared: the strings and span vectors of the entries
-    // that stay keep their capacity from message to message.
     out.fields.resize(n);
-    for (uint32_t i = 0; i < n; ++i) {
-        const HostDecodedField *f = host_Decoded(i);
-        DecodedOut &d = out.fields[i];
-        d.id = f->fieldId;
-        d.label.assign(f->label);
-        d.text.assign(f->text);
-        d.selector = f->selector;
-        d.spans.resize(f->spanCount);
-        for (uint32_t k = 0; k < f->spanCount; ++k)
-            d.spans[k] = SpanOut{f->spans[k].firstBit, f->spans[k].lastBit, f->spans[k].value};
-    }
+    HostFieldView f{};
+    for (uint32_t i = 0; i < n && host_DecodedView(i, &f) != 0; ++i)
+        out.fields[i] = DecodedOut{f.fieldId, std::string_view(f.label, f.labelLength),
+                                   std::string_view(f.text, f.textLength), f.selector,
+                                   std::span<const SpanOut>(f.spans, f.spanCount)};
 }
 
 void collectDisplay(DisplayPassOut &out) {
     const uint32_t n = host_DisplayCount();
     out.fields.resize(n);
-    for (uint32_t i = 0; i < n; ++i) {
-        const HostDisplayField *f = host_Display(i);
-        out.fields[i].displayId = f->displayId;
-        out.fields[i].text.assign(f->text);
-    }
+    HostDisplayView f{};
+    for (uint32_t i = 0; i < n && host_DisplayView(i, &f) != 0; ++i)
+        out.fields[i] = DisplayOut{f.displayId, std::string_view(f.text, f.textLength)};
 }
 
 } // namespace
@@ -99,6 +91,7 @@ bool loadModule(const std::string &path, Module &module, std::string &error) {
 }
 
 Session::Session(const Module &module) : module_(module), keyBuffer_(kKeyBufferSize, 0) {
+    static_assert(HOST_KEY_DATA_START <= kKeyBufferSize);
     state_ = host_NewState(nullptr, 0);
     if (state_ == nullptr)
         return;
@@ -131,26 +124,24 @@ void Session::prepareRequest() {
 
 void Session::runMd(MdOut &out) {
     host_ResetState(state_);
-    host_ClearRecords();
+    host_ClearDecodedRecords();
     prepareRequest();
     out.result = module_.preDecodeMD(&request_);
     out.remainingBits = request_.remainingBits;
     out.errorFlags = state_->errorFlags;
     out.layerFirst = request_.layerEntries[0].firstBit;
     out.layerLast = request_.layerEntries[0].lastBit;
-    collectDecoded(out);
-    host_ClearRecords();
+    collectDecoded(out); // the records stay until the next message's pass
 }
 
 void Session::runDisplay(DisplayPassOut &out) {
     host_ResetState(state_);
-    host_ClearRecords();
+    host_ClearDisplayRecords();
     prepareRequest();
     out.result = module_.preDecodeTO(&request_);
     out.remainingBits = request_.remainingBits;
     out.errorFlags = state_->errorFlags;
     collectDisplay(out);
-    host_ClearRecords();
 }
 
 void Session::runView(ViewOut &out) {
@@ -164,7 +155,10 @@ void Session::runView(ViewOut &out) {
 
 void Session::runKeys(KeysOut &out) {
     host_ResetState(state_);
-    std::fill(keyBuffer_.begin(), keyBuffer_.end(), 0);
+    // The pass writes the presence bits and slots, and its values from the
+    // data start up to the data offset it leaves; only what the last pass
+    // may have written is cleared.
+    std::memset(keyBuffer_.data(), 0, keyBufferUsed_);
     KeyFieldRequest rq{};
     rq.keyBuffer = keyBuffer_.data();
     rq.dataOffset = HOST_KEY_DATA_START;
@@ -173,7 +167,12 @@ void Session::runKeys(KeysOut &out) {
     out.result = module_.keyFields(&rq);
     out.remainingBits = rq.remainingBits;
     out.errorFlags = state_->errorFlags;
-    out.entries = readKeyEntries(keyBuffer_.data(), kKeyBufferSize);
+    // A value that did not fit may have been written in part past the data
+    // offset: after a failed pass the whole buffer is cleared next time.
+    keyBufferUsed_ = out.result == 1 && rq.dataOffset >= HOST_KEY_DATA_START && rq.dataOffset <= kKeyBufferSize
+                         ? rq.dataOffset
+                         : kKeyBufferSize;
+    readKeyEntries(keyBuffer_.data(), kKeyBufferSize, out.entries);
 }
 
 void Session::run(const uint8_t *message, size_t size, const PassSelection &passes, MessageResult &out) {

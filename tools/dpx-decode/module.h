@@ -4,10 +4,13 @@
 
 #include <cstdint>
 #include <optional>
+#include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "dpx_camel.h"
+#include "dpx_standin_host.h"
 #include "key_layout.h"
 
 namespace dpxdecode {
@@ -48,18 +51,17 @@ struct PassOutcome {
     uint32_t errorFlags = 0;
 };
 
-struct SpanOut {
-    uint32_t first = 0;
-    uint32_t last = 0;
-    uint32_t value = 0;
-};
+// A bit range of a field and its value, as the host recorded it.
+using SpanOut = HostSpan;
 
+// One decoded field.  The texts and spans are views into what the host
+// recorded: valid until the session runs the next message.
 struct DecodedOut {
     uint32_t id = 0;
-    std::string label;
-    std::string text;
+    std::string_view label;
+    std::string_view text;
     uint32_t selector = 0;
-    std::vector<SpanOut> spans;
+    std::span<const SpanOut> spans;
 };
 
 struct MdOut : PassOutcome {
@@ -70,7 +72,7 @@ struct MdOut : PassOutcome {
 
 struct DisplayOut {
     uint32_t displayId = 0;
-    std::string text;
+    std::string_view text; // valid until the session runs the next message
 };
 
 struct DisplayPassOut : PassOutcome {
@@ -109,7 +111,9 @@ public:
 
     // Runs the selected passes over `message` (which must stay valid during
     // the call).  `out` is filled in place; the passes not selected are
-    // reset.
+    // reset.  The decoded and display fields in `out` view what the host
+    // recorded and stay valid until the next call: nothing is copied or
+    // allocated per field.
     void run(const uint8_t *message, size_t size, const PassSelection &passes, MessageResult &out);
 
 private:
@@ -124,6 +128,7 @@ private:
     const uint8_t *ownBuffer_ = nullptr; // the state's own (empty) message buffer
     PreDecodeRequest request_{};
     std::vector<uint8_t> keyBuffer_;
+    uint32_t keyBufferUsed_ = 0; // bytes the last key pass may have written
 };
 
 } // namespace dpxdecode

@@ -28,14 +28,14 @@ constexpr uint32_t kCalled = 10, kCharge = 12, kCalling = 15, kImsi = 17, kOtid 
 
 std::string valueText(const DecodedOut &f) {
     const size_t eq = f.text.find('=');
-    return eq == std::string::npos ? std::string() : f.text.substr(eq + 1);
+    return eq == std::string::npos ? std::string() : std::string(f.text.substr(eq + 1));
 }
 
 // The field's spans read as one number, first span most significant.
 uint64_t spanValue(const DecodedOut &f) {
     uint64_t v = 0;
     for (const SpanOut &s : f.spans) {
-        const uint32_t width = s.last >= s.first ? s.last - s.first + 1 : 0;
+        const uint32_t width = s.lastBit >= s.firstBit ? s.lastBit - s.firstBit + 1 : 0;
         v = width >= 32 ? s.value : (v << width) | s.value;
     }
     return v;
@@ -206,7 +206,7 @@ void extractFacts(uint64_t index, const uint8_t *bytes, size_t size, const Messa
         case fid::kObjectIdLength:
             // The context name's octets follow its length octet.
             if (inContextName && !f.spans.empty() && out.applicationContext.empty()) {
-                const size_t at = f.spans.back().last / 8;
+                const size_t at = f.spans.back().lastBit / 8;
                 const size_t n = f.spans.back().value;
                 if (at <= size && n <= size - at) {
                     out.applicationContext = dottedOid(bytes + at, n);

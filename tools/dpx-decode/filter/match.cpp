@@ -27,12 +27,12 @@ std::string fold(const std::string &s) {
 }
 
 // Blanks at both ends removed, lower case (for labels and values).
-std::string trimLower(const std::string &s) {
+std::string trimLower(std::string_view s) {
     const size_t a = s.find_first_not_of(' ');
-    if (a == std::string::npos)
+    if (a == std::string_view::npos)
         return {};
     const size_t b = s.find_last_not_of(' ');
-    std::string out = s.substr(a, b - a + 1);
+    std::string out(s.substr(a, b - a + 1));
     for (char &c : out)
         if (c >= 'A' && c <= 'Z')
             c = char(c - 'A' + 'a');

@@ -174,12 +174,13 @@ private:
         char *line = nullptr;
         size_t capacity = 0;
         size_t lineNo = 0;
+        HexLine parsed; // its byte vector and the message's trade places, keeping both capacities
         for (ssize_t n; (n = getline(&line, &capacity, f)) >= 0;) {
             ++lineNo;
             std::string_view text(line, size_t(n));
             if (!text.empty() && text.back() == '\n')
                 text.remove_suffix(1);
-            HexLine parsed = parseHexLine(text);
+            parseHexLine(text, parsed);
             if (parsed.kind == LineKind::Empty)
                 continue;
             if (parsed.kind == LineKind::Bad) {
@@ -188,7 +189,7 @@ private:
                 continue;
             }
             msg.line = lineNo;
-            msg.bytes = std::move(parsed.bytes);
+            msg.bytes.swap(parsed.bytes);
             onMessage_(msg);
         }
         std::free(line);

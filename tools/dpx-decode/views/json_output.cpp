@@ -31,7 +31,7 @@ void mdJson(Writer &w, const MdOut &md) {
         w.raw(",").key("selector").number(f.selector).raw(",").key("spans").raw("[");
         bool firstSpan = true;
         for (const SpanOut &s : f.spans) {
-            w.raw(firstSpan ? "[" : ",[").number(s.first).raw(",").number(s.last).raw(",").number(s.value).raw("]");
+            w.raw(firstSpan ? "[" : ",[").number(s.firstBit).raw(",").number(s.lastBit).raw(",").number(s.value).raw("]");
             firstSpan = false;
         }
         w.raw("]}");

@@ -2,6 +2,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include <charconv>
 #include <ostream>
 
 #include "field_kinds.h"
@@ -60,11 +61,6 @@ const char *capVersion(uint32_t capArc, uint32_t versionArc) {
     default:
         return "";
     }
-}
-
-const std::string &orDash(const std::string &s) {
-    static const std::string dash = "-";
-    return s.empty() ? dash : s;
 }
 
 void appendGt(std::string &out, const capture::GlobalTitle &gt) {
@@ -228,44 +224,83 @@ void writeSummary(std::ostream &os, uint64_t index, const CaptureOrigin *origin,
         os.write(line.data(), std::streamsize(line.size()));
         return;
     }
+    const auto number = [](std::string &out, uint64_t v) {
+        char buf[24];
+        const auto r = std::to_chars(buf, buf + sizeof buf, v);
+        out.append(buf, size_t(r.ptr - buf));
+    };
+    const auto orDash = [](const std::string &v) {
+        if (v.empty())
+            line += '-';
+        else
+            line += v;
+    };
     if (origin != nullptr) {
         const capture::TcapMessage &c = origin->carrier;
-        line += "frame " + std::to_string(origin->frame) + ' ';
+        line += "frame ";
+        number(line, origin->frame);
+        line += ' ';
         time.append(line, origin->seconds, origin->nanoseconds);
         line += " pc ";
-        line += c.hasPointCodes ? std::to_string(c.opc) + '>' + std::to_string(c.dpc) : "-";
+        if (c.hasPointCodes) {
+            number(line, c.opc);
+            line += '>';
+            number(line, c.dpc);
+        } else {
+            line += '-';
+        }
         line += " ssn ";
-        line += c.hasCallingSsn ? std::to_string(c.callingSsn) : "-";
+        if (c.hasCallingSsn)
+            number(line, c.callingSsn);
+        else
+            line += '-';
         line += '>';
-        line += c.hasCalledSsn ? std::to_string(c.calledSsn) : "-";
+        if (c.hasCalledSsn)
+            number(line, c.calledSsn);
+        else
+            line += '-';
         line += " gt ";
         appendGt(line, c.callingGt);
         line += '>';
         appendGt(line, c.calledGt);
     } else {
-        line += "message " + std::to_string(index);
+        line += "message ";
+        number(line, index);
     }
     line += ' ';
     line += s.type.empty() ? "?" : s.type;
-    line += " otid=" + orDash(s.otid) + " dtid=" + orDash(s.dtid);
-    if (!s.capVersion.empty())
-        line += ' ' + s.capVersion;
-    if (!s.abortCause.empty())
-        line += " abort=" + s.abortCause;
+    line += " otid=";
+    orDash(s.otid);
+    line += " dtid=";
+    orDash(s.dtid);
+    if (!s.capVersion.empty()) {
+        line += ' ';
+        line += s.capVersion;
+    }
+    if (!s.abortCause.empty()) {
+        line += " abort=";
+        line += s.abortCause;
+    }
     for (size_t i = 0; i < s.componentCount; ++i) {
         const ComponentSummary &c = s.components[i];
         line += " | ";
         line += componentKindName(c.kind);
-        line += ' ' + orDash(c.invokeId);
+        line += ' ';
+        orDash(c.invokeId);
         const std::pair<const char *, const std::string *> parts[] = {
             {"", &c.name},          {"sk=", &c.serviceKey}, {"imsi=", &c.imsi},   {"called=", &c.called},
             {"calling=", &c.calling}, {"cause=", &c.cause}, {"event=", &c.event}};
         for (const auto &[what, value] : parts)
-            if (!value->empty())
-                line += ' ' + (what + *value);
+            if (!value->empty()) {
+                line += ' ';
+                line += what;
+                line += *value;
+            }
     }
-    if (s.errorFlags != 0)
-        line += " ! " + describeErrorFlags(s.errorFlags);
+    if (s.errorFlags != 0) {
+        line += " ! ";
+        line += describeErrorFlags(s.errorFlags);
+    }
     line += '\n';
     os.write(line.data(), std::streamsize(line.size()));
 }

@@ -101,7 +101,7 @@ void writeKeys(Text &os, const KeysOut &k) {
 void writeSpans(Text &os, const DecodedOut &f) {
     os << ' ';
     for (const SpanOut &s : f.spans)
-        os << " [" << s.first << '-' << s.last << "]=" << s.value;
+        os << " [" << s.firstBit << '-' << s.lastBit << "]=" << s.value;
 }
 
 // The decoded fields as a tree.  An element is a tag field, the length
@@ -124,12 +124,12 @@ private:
     };
     void build(const MdOut &md);
     bool collapsed(size_t tag) const {
-        return shown_[tag] == 1 && fieldKind(ids_[size_t(only_[tag])]) == FieldKind::Value;
+        return shown_[tag] == 1 && kinds_[size_t(only_[tag])] == FieldKind::Value;
     }
 
     std::vector<Open> stack_;
     std::vector<int32_t> parent_; // per field: its element's tag field
-    std::vector<uint32_t> ids_;
+    std::vector<FieldKind> kinds_; // per field, looked up once
     std::vector<uint16_t> shown_; // per tag field: children shown in the values view
     std::vector<int32_t> only_;   // per tag field: its first such child
     std::vector<uint16_t> depth_;
@@ -147,21 +147,20 @@ void FieldTree::build(const MdOut &md) {
     const size_t n = md.fields.size();
     stack_.clear();
     parent_.assign(n, kNone);
-    ids_.resize(n);
+    kinds_.resize(n);
     shown_.assign(n, 0);
     only_.assign(n, kNone);
     uint32_t lastBit = 0;
     for (size_t i = 0; i < n; ++i) {
         const DecodedOut &f = md.fields[i];
-        ids_[i] = f.id;
-        const FieldKind kind = fieldKind(f.id);
+        const FieldKind kind = kinds_[i] = fieldKind(f.id);
         uint32_t first = lastBit, last = lastBit;
         if (!f.spans.empty()) {
-            first = f.spans[0].first;
-            last = f.spans[0].last;
+            first = f.spans[0].firstBit;
+            last = f.spans[0].lastBit;
             for (const SpanOut &s : f.spans) {
-                first = s.first < first ? s.first : first;
-                last = s.last > last ? s.last : last;
+                first = s.firstBit < first ? s.firstBit : first;
+                last = s.lastBit > last ? s.lastBit : last;
             }
         }
         lastBit = last;
@@ -214,7 +213,7 @@ void FieldTree::write(Text &os, const MdOut &md, const TextOptions &options) {
     depth_.assign(md.fields.size(), 0);
     for (size_t i = 0; i < md.fields.size(); ++i) {
         const DecodedOut &f = md.fields[i];
-        const FieldKind kind = fieldKind(f.id);
+        const FieldKind kind = kinds_[i];
         if (parent_[i] != kNone) {
             const size_t p = size_t(parent_[i]);
             depth_[i] = uint16_t(depth_[p] + (all || !collapsed(p) ? 1 : 0));
