@@ -34,6 +34,10 @@ public:
 private:
     TimeFormat format_;
     decltype(&date_conv) dateConv_;
+    // The last second the module formatted and its text: frames come many
+    // to a second, and the module's formatter is the costly part.
+    mutable int64_t cachedSecond_ = -1;
+    mutable std::string cachedDate_;
     bool based_ = false;
     int64_t baseSeconds_ = 0;
     uint32_t baseNanoseconds_ = 0;

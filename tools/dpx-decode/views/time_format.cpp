@@ -13,16 +13,22 @@ void TimeFormatter::appendUtc(std::string &out, int64_t seconds, uint32_t nanose
         out += formatTime(seconds, nanoseconds);
         return;
     }
-    unsigned char record[216] = {};
-    const auto s = uint32_t(seconds);
-    std::memcpy(record + 212, &s, sizeof s);
-    char date[48] = {};
-    dateConv_(date, 0, record);
-    date[10] = 'T'; // "YYYY-MM-DD hh:mm:ss"
-    out += date;
-    char fraction[16];
-    const int n = std::snprintf(fraction, sizeof fraction, ".%06uZ", nanoseconds / 1000 % 1000000);
-    out.append(fraction, size_t(n));
+    if (seconds != cachedSecond_) {
+        unsigned char record[216] = {};
+        const auto s = uint32_t(seconds);
+        std::memcpy(record + 212, &s, sizeof s);
+        char date[48] = {};
+        dateConv_(date, 0, record);
+        date[10] = 'T'; // "YYYY-MM-DD hh:mm:ss"
+        cachedDate_.assign(date, strnlen(date, sizeof date - 1));
+        cachedSecond_ = seconds;
+    }
+    out += cachedDate_;
+    // ".uuuuuuZ": microseconds, truncated.
+    char fraction[9] = {'.', '0', '0', '0', '0', '0', '0', 'Z', 0};
+    for (uint32_t v = nanoseconds / 1000 % 1000000, i = 6; i > 0; v /= 10, --i)
+        fraction[i] = char('0' + v % 10);
+    out.append(fraction, 8);
 }
 
 void TimeFormatter::append(std::string &out, int64_t seconds, uint32_t nanoseconds) {
