@@ -63,6 +63,14 @@ void WriteBitRange(uint8_t *dst, uint32_t lastBit, uint32_t firstBit,
     if (lastBit < firstBit)
         return;
     const uint32_t count = lastBit - firstBit + 1;
+    // Whole octets from an octet boundary (most spans): copied a byte at a
+    // time, zeros past the source's bytes.
+    if (firstBit % 8 == 0 && count % 8 == 0) {
+        uint8_t *to = dst + firstBit / 8;
+        for (uint32_t k = 0; k < count / 8; ++k)
+            to[k] = k < kSpanValueBytes ? src[k] : uint8_t{0};
+        return;
+    }
     for (uint32_t i = 0; i < count; ++i) {
         const uint32_t bit =
             i < 8 * kSpanValueBytes ? (src[i / 8] >> (i % 8)) & 1u : 0u;

@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <vector>
 
@@ -97,6 +98,29 @@ TEST(WriteBitRange, WritesOnlyTheRangeFromTheSourcesLowBits) {
     const uint8_t src[camel::kSpanValueBytes] = {0xA5, 0x3C, 0, 0};
     camel::WriteBitRange(dst, 17, 6, src); // 12 bits of 0x3CA5 from bit 6 on
     EXPECT_EQ(Bytes(dst, dst + 3), (Bytes{0x40, 0x29, 0x03}));
+}
+
+// Every start and width, octet-aligned or not, against a bit-by-bit model:
+// the bits of the range come from the source's low bits (zeros past its
+// bytes), every other bit of the destination is left as it was.
+TEST(WriteBitRange, MatchesABitByBitModelAtEveryOffsetAndWidth) {
+    const uint8_t src[camel::kSpanValueBytes] = {0xA5, 0x3C, 0x81, 0x7E};
+    for (uint32_t first = 0; first < 24; ++first)
+        for (uint32_t count = 1; count <= 48; ++count) {
+            uint8_t dst[10];
+            for (size_t k = 0; k < sizeof dst; ++k)
+                dst[k] = uint8_t(0x96 ^ (k * 0x1D));
+            uint8_t want[10];
+            std::copy(dst, dst + sizeof dst, want);
+            for (uint32_t i = 0; i < count; ++i) {
+                const uint32_t bit = i < 32 ? (src[i / 8] >> (i % 8)) & 1u : 0u;
+                const uint32_t d = first + i;
+                want[d / 8] = uint8_t((want[d / 8] & ~(1u << (d % 8))) | bit << (d % 8));
+            }
+            camel::WriteBitRange(dst, first + count - 1, first, src);
+            ASSERT_EQ(Bytes(dst, dst + sizeof dst), Bytes(want, want + sizeof want))
+                << "from bit " << first << ", " << count << " bits";
+        }
 }
 
 } // namespace
