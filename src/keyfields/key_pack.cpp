@@ -3,6 +3,7 @@
 
 #include "keyfields/key_pack.h"
 
+#include <algorithm>
 #include <cstring>
 
 namespace camel {
@@ -63,23 +64,20 @@ void WriteBitRange(uint8_t *dst, uint32_t lastBit, uint32_t firstBit,
     if (lastBit < firstBit)
         return;
     const uint32_t count = lastBit - firstBit + 1;
-    // Whole octets from an octet boundary (most spans): copied a byte at a
-    // time, zeros past the source's bytes.
-    if (firstBit % 8 == 0 && count % 8 == 0) {
-        uint8_t *to = dst + firstBit / 8;
-        for (uint32_t k = 0; k < count / 8; ++k)
-            to[k] = k < kSpanValueBytes ? src[k] : uint8_t{0};
-        return;
-    }
-    for (uint32_t i = 0; i < count; ++i) {
-        const uint32_t bit =
-            i < 8 * kSpanValueBytes ? (src[i / 8] >> (i % 8)) & 1u : 0u;
+    static_assert(kSpanValueBytes <= 4, "a span value fits 32 bits");
+    uint32_t value = 0; // the source's bits; zeros above its 32
+    for (uint32_t k = kSpanValueBytes; k-- > 0;)
+        value = value << 8 | src[k];
+    // One destination octet at a time: the bits of the range that fall in
+    // it, the others kept.
+    for (uint32_t i = 0; i < count;) {
         const uint32_t d = firstBit + i;
-        const auto mask = static_cast<uint8_t>(1u << (d % 8));
-        if (bit != 0)
-            dst[d / 8] = static_cast<uint8_t>(dst[d / 8] | mask);
-        else
-            dst[d / 8] = static_cast<uint8_t>(dst[d / 8] & ~mask);
+        const uint32_t at = d % 8;
+        const uint32_t n = std::min(8 - at, count - i);
+        const uint32_t bits = (i < 32 ? value >> i : 0u) & ((1u << n) - 1);
+        const auto mask = static_cast<uint8_t>(((1u << n) - 1) << at);
+        dst[d / 8] = static_cast<uint8_t>((dst[d / 8] & ~mask) | bits << at);
+        i += n;
     }
 }
 
