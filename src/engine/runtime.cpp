@@ -56,7 +56,7 @@ uint32_t ReverseBits(uint32_t value, uint32_t n) {
     return result;
 }
 
-uint32_t ExtractBits(const uint8_t *buffer, uint32_t from, uint32_t to) {
+uint32_t ExtractBitsAnyRange(const uint8_t *buffer, uint32_t from, uint32_t to) {
     static constexpr uint8_t kMask[8] = {1, 3, 7, 15, 31, 63, 127, 255};
     const bool reversed = static_cast<int32_t>(from) > static_cast<int32_t>(to);
     const uint32_t lo = (reversed ? to : from) - 1;

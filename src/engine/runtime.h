@@ -12,7 +12,16 @@ namespace camel {
 // (both inclusive).  A read across octets assembles them least significant
 // octet first.  When from > to the bits come back in reverse order.  The
 // caller keeps the range within 32 bits and within the message.
-uint32_t ExtractBits(const uint8_t *buffer, uint32_t from, uint32_t to);
+uint32_t ExtractBitsAnyRange(const uint8_t *buffer, uint32_t from, uint32_t to);
+
+// The same; bits in order within one octet (most reads) are taken inline.
+inline uint32_t ExtractBits(const uint8_t *buffer, uint32_t from, uint32_t to) {
+    const uint32_t lo = from - 1;
+    const uint32_t hi = to - 1;
+    if (from != 0 && from <= to && lo >> 3 == hi >> 3)
+        return static_cast<uint32_t>(buffer[lo >> 3] >> (lo & 7u)) & ((2u << (hi - lo)) - 1u);
+    return ExtractBitsAnyRange(buffer, from, to);
+}
 
 // The low n bits of value in reverse order.
 uint32_t ReverseBits(uint32_t value, uint32_t n);
