@@ -38,7 +38,7 @@ bool MessageDecoder::decode(const InputMessage &msg, uint64_t index, bool mayBas
     if (s.summary || s.stats || s.ek) {
         summarize(*result_.md, summary_);
         if (s.ek)
-            writeEk(out_, msg, index, toHex(msg.bytes), result_, summary_, time_);
+            writeEk(out_, msg, index, messageHex(msg), result_, summary_, time_);
         if (s.summary)
             writeSummary(out_, index, msg.capture, summary_, time_, s.json);
     }
@@ -49,7 +49,7 @@ bool MessageDecoder::decode(const InputMessage &msg, uint64_t index, bool mayBas
             hiddenMd_.swap(result_.md);
         if (!s.showKeys)
             hiddenKeys_.swap(result_.keys);
-        const std::string hex = toHex(msg.bytes);
+        const std::string &hex = messageHex(msg);
         if (s.json)
             writeJson(out_, index, hex, result_, msg.capture);
         else
@@ -60,6 +60,12 @@ bool MessageDecoder::decode(const InputMessage &msg, uint64_t index, bool mayBas
             hiddenKeys_.swap(result_.keys);
     }
     return true;
+}
+
+const std::string &MessageDecoder::messageHex(const InputMessage &msg) {
+    hex_.clear();
+    appendHex(hex_, msg.bytes.data(), msg.bytes.size());
+    return hex_;
 }
 
 void OrderedSinks::take(const dialogues::MessageFacts *facts, bool selected, const MessageSummary *summary,

@@ -93,6 +93,8 @@ public:
     uint32_t baseNanoseconds() const { return baseNanoseconds_; }
 
 private:
+    const std::string &messageHex(const InputMessage &msg);
+
     const DecodeSettings &settings_;
     Session session_;
     TimeFormatter time_;
@@ -107,6 +109,7 @@ private:
     StringBuf buf_{text_};
     std::ostream out_{&buf_};
     std::string scratch_;
+    std::string hex_; // the message in hex, kept with its capacity
     bool timeBased_ = false;
     int64_t baseSeconds_ = 0;
     uint32_t baseNanoseconds_ = 0;
