@@ -107,30 +107,6 @@ TEST(DialoguePdu, ResponseResultAndDiagnostic) {
     }
 }
 
-TEST(DialoguePdu, AbortSource) {
-    for (uint8_t source : {0, 1}) {
-        const auto d = decode(tlv(0x67, cat({hexBytes("49 01 07"),
-                                             structured(tlv(0x64, Bytes{0x80, 1, source}))})));
-        EXPECT_EQ(textsFrom(d, 3760),
-                  (Texts{"  Dialogue PDU=Dialogue Abort", "LENGTH=3 octet(s)", "Abort Source Tag=80",
-                         "  Length=1 octet(s)",
-                         source ? "  Abort Source Value=Dialogue Service Provider"
-                                : "  Abort Source Value=Dialogue Service User"}));
-        EXPECT_EQ(d.md.errorFlags, 0u);
-    }
-}
-
-TEST(DialoguePdu, Unidirectional) {
-    const Bytes uni = tlv(0x6B, tlv(0x28, cat({kUniDialogueAs,
-                                               tlv(0xA0, tlv(0x60, cat({kProtocolVersion, cap2()})))})));
-    const auto d = decode(tlv(0x61, cat({uni, hexBytes("6c 00")})));
-    EXPECT_EQ(d.find(3724)->text, "  UnidialoguePDU=2");
-    EXPECT_EQ(d.find(3728)->text, "Unidirectional Dialogue Tag=60");
-    EXPECT_EQ(d.find(3622)->id, 3622u);
-    EXPECT_EQ(d.find(3800)->text, "  version=2");
-    EXPECT_EQ(d.md.errorFlags, 0u);
-}
-
 // Indefinite lengths: the delimited constructs read their members through
 // end-of-contents checks; the [0] wrapper and the PDUs are pre-bounded and
 // need definite lengths.
