@@ -12,11 +12,7 @@
 
 #include "support/harness.h"
 
-using camel::test::Bytes;
-using camel::test::argumentTexts;
-using camel::test::decode;
-using camel::test::hexBytes;
-using camel::test::Span;
+using namespace camel::test;
 using Texts = std::vector<std::string>;
 
 namespace {

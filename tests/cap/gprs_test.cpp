@@ -12,12 +12,7 @@
 
 #include "support/harness.h"
 
-using camel::test::Bytes;
-using camel::test::decode;
-using camel::test::invoke;
-using camel::test::shownOf;
-using camel::test::Span;
-using camel::test::textsFrom;
+using namespace camel::test;
 using Texts = std::vector<std::string>;
 
 namespace {

@@ -11,13 +11,7 @@
 #include "engine/scratch.h"
 #include "support/harness.h"
 
-using camel::test::Bytes;
-using camel::test::decode;
-using camel::test::shownOf;
-using camel::test::textsFrom;
-using camel::test::tlv;
-using camel::test::hexBytes;
-using camel::test::Span;
+using namespace camel::test;
 using Texts = std::vector<std::string>;
 
 namespace {

@@ -154,32 +154,28 @@ def build_calls(callflow, c, seed, rounds):
     rng = random.Random(seed)
     rec = Recorder(callflow, c, rng)
     calls, events = [], []
+
+    def add(kind, pc, tid_a, tid_b, start, steps):
+        msgs, idp = rec.make(kind, tid_a, tid_b)
+        t = start()
+        call = {'kind': kind, 'pc': pc, 'idp': idp, 'messages': []}
+        for side, hexmsg, desc in msgs:
+            mtype, comps = parse_desc(desc)
+            call['messages'].append({'t': t, 'side': side, 'type': mtype, 'comps': comps})
+            events.append((t, len(events), side, pc, hexmsg, call['messages'][-1]))
+            t += steps()
+        calls.append(call)
+
     n = 0
     for r in range(rounds):
         for kind in KINDS:
-            pc = SSF_PCS[n % len(SSF_PCS)]
             # Ids repeat across the SSFs: three calls at once share them.
-            tid_a, tid_b = 0x10000000 + n // len(SSF_PCS), 0x80000000 + n // len(SSF_PCS)
-            msgs, idp = rec.make(kind, tid_a, tid_b)
-            t = 40 * n + rng.randint(0, 30)  # ms
-            call = {'kind': kind, 'pc': pc, 'idp': idp, 'messages': []}
-            for side, hexmsg, desc in msgs:
-                mtype, comps = parse_desc(desc)
-                call['messages'].append({'t': t, 'side': side, 'type': mtype, 'comps': comps})
-                events.append((t, len(events), side, pc, hexmsg, call['messages'][-1]))
-                t += rng.choice((1, 2, 3, 5, 8, 13, 21, 40, 150, 400, 1200))
-            calls.append(call)
+            add(kind, SSF_PCS[n % len(SSF_PCS)], 0x10000000 + n // len(SSF_PCS), 0x80000000 + n // len(SSF_PCS),
+                lambda: 40 * n + rng.randint(0, 30), lambda: rng.choice((1, 2, 3, 5, 8, 13, 21, 40, 150, 400, 1200)))
             n += 1
     # One last call long after the rest: every silent dialogue times out.
-    last_t = max(e[0] for e in events) + (TIMEOUT + 5) * 1000
-    msgs, idp = rec.make('answered', 0x1FFFFFFF, 0x8FFFFFFF)
-    call = {'kind': 'answered', 'pc': SSF_PCS[0], 'idp': idp, 'messages': []}
-    for side, hexmsg, desc in msgs:
-        mtype, comps = parse_desc(desc)
-        call['messages'].append({'t': last_t, 'side': side, 'type': mtype, 'comps': comps})
-        events.append((last_t, len(events), side, SSF_PCS[0], hexmsg, call['messages'][-1]))
-        last_t += 7
-    calls.append(call)
+    last = max(e[0] for e in events) + (TIMEOUT + 5) * 1000
+    add('answered', SSF_PCS[0], 0x1FFFFFFF, 0x8FFFFFFF, lambda: last, lambda: 7)
 
     lines = []
     for frame, (t, _, side, pc, hexmsg, msg) in enumerate(sorted(events, key=lambda e: (e[0], e[1])), 1):

@@ -6,9 +6,9 @@
 
 #include <cstring>
 #include <algorithm>
-#include <map>
 #include <set>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "dpx_camel.h"
@@ -153,9 +153,6 @@ TEST(DescriptionTables, TerminatedAndCrossIndexed) {
     EXPECT_STREQ(last.label, DPX_LAST_FIELD);
 
     std::set<uint32_t> ids;
-    size_t codeCount = 0;
-    for (size_t v = 0; v < t.valueCount; ++v)
-        codeCount = std::max<size_t>(codeCount, t.values[v].codeIndex + 1);
     size_t nextValue = 0;
     for (size_t i = 0; i < t.fields; ++i) {
         const CatalogueEntry &e = t.catalogue[i];
@@ -163,10 +160,8 @@ TEST(DescriptionTables, TerminatedAndCrossIndexed) {
         EXPECT_TRUE(ids.insert(e.fieldId).second);
         EXPECT_LT(e.formatIndex, t.stringCount - 1);
         EXPECT_LT(e.attributeOffset, DPX_ATTRIBUTE_TABLE_SIZE);
-        EXPECT_EQ(std::string(e.label), std::string(camel::kFields[i].label).substr(
-                                            std::string(camel::kFields[i].label).find_first_not_of(' ') == std::string::npos
-                                                ? std::string(camel::kFields[i].label).size()
-                                                : std::string(camel::kFields[i].label).find_first_not_of(' ')));
+        const std::string_view label = camel::kFields[i].label; // without its leading blanks
+        EXPECT_EQ(e.label, label.substr(std::min(label.size(), label.find_first_not_of(' '))));
         if (e.valueCount == 0)
             continue;
         // Value entries are consecutive, in catalogue order, and cover the table.

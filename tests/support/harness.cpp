@@ -164,15 +164,24 @@ struct TableWalk {
     int keys(KeyFieldRequest *rq) const { return run<Pass::KeyField>(rq); }
 };
 
+// A key-field request over `state` with `room` octets for the values, in
+// `buffer`.
+KeyFieldRequest keyRequest(Bytes &buffer, DecodeState *state,
+                           uint16_t room = static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START)) {
+    buffer.assign(kKeyBufferSize, 0);
+    KeyFieldRequest kr{};
+    kr.keyBuffer = buffer.data();
+    kr.dataOffset = HOST_KEY_DATA_START;
+    kr.valueRoom = room;
+    kr.state = state;
+    return kr;
+}
+
 template <class Passes>
 KeyRun runKeysWith(const Bytes &message, uint16_t room, const Passes &passes) {
     State s(message);
-    KeyRun run{0, {}, Bytes(kKeyBufferSize, 0), 0, {}};
-    KeyFieldRequest rq{};
-    rq.keyBuffer = run.buffer.data();
-    rq.dataOffset = HOST_KEY_DATA_START;
-    rq.valueRoom = room;
-    rq.state = s.st;
+    KeyRun run{};
+    KeyFieldRequest rq = keyRequest(run.buffer, s.st, room);
     run.result = passes.keys(&rq);
     run.end = endOf(run.result, s.st);
     run.dataOffset = rq.dataOffset;
@@ -289,26 +298,16 @@ uint32_t growthFlagOf(const DecodeState *st) {
 
 enum class Which { MD, TO, MV, KF };
 
-// A key-field request over `state` with room for every key, in `buffer`.
-KeyFieldRequest keyRequest(Bytes &buffer, DecodeState *state) {
-    buffer.assign(kKeyBufferSize, 0);
-    KeyFieldRequest kr{};
-    kr.keyBuffer = buffer.data();
-    kr.dataOffset = HOST_KEY_DATA_START;
-    kr.valueRoom = static_cast<uint16_t>(kKeyBufferSize - HOST_KEY_DATA_START);
-    kr.state = state;
-    return kr;
-}
-
 // One pass over the state of `r`; the key-field pass with room for every key.
-int runPass(Which which, PreRequest &r) {
+template <class Passes>
+int runPass(const Passes &passes, Which which, PreRequest &r) {
     Bytes keyBuffer;
     KeyFieldRequest kr = keyRequest(keyBuffer, r.rq.state);
     switch (which) {
-    case Which::MD: return dpx_PreDecodeMD(&r.rq);
-    case Which::TO: return dpx_PreDecodeTO(&r.rq);
-    case Which::MV: return dpx_PreDecodeMV(&r.rq);
-    case Which::KF: return KFE_3gpp_camel_400(&kr);
+    case Which::MD: return passes.md(&r.rq);
+    case Which::TO: return passes.display(&r.rq);
+    case Which::MV: return passes.view(&r.rq);
+    case Which::KF: return passes.keys(&kr);
     }
     return -1;
 }
@@ -320,16 +319,8 @@ bool runFailing(const Bytes &message, const Passes &passes, Which which, uint32_
     State s(message);
     shrinkArrays(s.st);
     PreRequest r(s.st);
-    Bytes keyBuffer;
-    KeyFieldRequest kr = keyRequest(keyBuffer, s.st);
     host_SetReallocFailAt(n);
-    int result = 0;
-    switch (which) {
-    case Which::MD: result = passes.md(&r.rq); break;
-    case Which::TO: result = passes.display(&r.rq); break;
-    case Which::MV: result = passes.view(&r.rq); break;
-    case Which::KF: result = passes.keys(&kr); break;
-    }
+    const int result = runPass(passes, which, r);
     const bool reached = host_ReallocCalls() >= n;
     host_SetReallocFailAt(0);
     host_ClearRecords();
@@ -377,7 +368,7 @@ uint32_t checkAccessPointNameFailure(const Bytes &message) {
     for (Which w : {Which::MD, Which::TO, Which::MV, Which::KF}) {
         State s(message);
         PreRequest r(s.st);
-        const int result = runPass(w, r);
+        const int result = runPass(EntryPoints{}, w, r);
         host_ClearRecords();
         if (w == Which::MD || w == Which::TO) {
             EXPECT_EQ(result, 0) << "pass " << int(w);

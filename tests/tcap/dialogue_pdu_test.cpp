@@ -11,37 +11,6 @@ using Texts = std::vector<std::string>;
 
 namespace {
 
-TEST(DialoguePdu, RequestFieldsIdsSpansAndDisplay) {
-    const auto d = decode(begin(structured(tlv(0x60, cat({kProtocolVersion, cap2()})))));
-    // (The texts of this request are those of dpx-decode's readable view
-    // test; the values are compared with tshark.)
-    EXPECT_EQ(d.md.errorFlags, 0u);
-    EXPECT_EQ(d.md.remainingBits, 0u);
-
-    // [0] in class-and-number form: two spans, bits 8-7 and 5-1, value 40.
-    const Field *wrapper = d.find(3758);
-    ASSERT_NE(wrapper, nullptr);
-    const uint32_t at = 8 * 21 + 1; // the A0 octet
-    EXPECT_EQ(wrapper->spans, (std::vector<Span>{{at + 6, at + 7, 2}, {at, at + 4, 0}}));
-    EXPECT_EQ(wrapper->selector, 1u);
-    const Field *version = d.find(3788);
-    ASSERT_NE(version, nullptr);
-    EXPECT_EQ(version->label, "  Protocol Version");
-    EXPECT_EQ(version->spans.size(), 2u);
-
-    // Shared labels are displayed under the first catalogue entry's id.
-    std::vector<std::pair<uint32_t, std::string>> shown;
-    for (size_t i = 5; i < d.shown.size(); ++i)
-        shown.emplace_back(d.shown[i].displayId, d.shown[i].text);
-    EXPECT_EQ(shown[0], (std::pair<uint32_t, std::string>{3615, "6b"}));
-    EXPECT_EQ(shown[2], (std::pair<uint32_t, std::string>{3622, "28"}));
-    EXPECT_EQ(shown[4], (std::pair<uint32_t, std::string>{3717, "6"}));
-    EXPECT_EQ(shown[5], (std::pair<uint32_t, std::string>{3718, "7 octet(s)"}));
-    EXPECT_EQ(shown[15], (std::pair<uint32_t, std::string>{3760, "DialogueRequest"}));
-    EXPECT_EQ(shown[19], (std::pair<uint32_t, std::string>{3788, "780"}));
-    EXPECT_EQ(shown[28], (std::pair<uint32_t, std::string>{3797, "ac_id"}));
-}
-
 TEST(DialoguePdu, ApplicationContextNames) {
     struct Case {
         const char *arcs;
@@ -105,30 +74,6 @@ TEST(DialoguePdu, ResponseResultAndDiagnostic) {
         EXPECT_EQ(d.find(3763)->text, "LENGTH=27 octet(s)");
         EXPECT_EQ(d.md.errorFlags, 0u);
     }
-}
-
-TEST(DialoguePdu, AbortSource) {
-    for (uint8_t source : {0, 1}) {
-        const auto d = decode(tlv(0x67, cat({hexBytes("49 01 07"),
-                                             structured(tlv(0x64, Bytes{0x80, 1, source}))})));
-        EXPECT_EQ(textsFrom(d, 3760),
-                  (Texts{"  Dialogue PDU=Dialogue Abort", "LENGTH=3 octet(s)", "Abort Source Tag=80",
-                         "  Length=1 octet(s)",
-                         source ? "  Abort Source Value=Dialogue Service Provider"
-                                : "  Abort Source Value=Dialogue Service User"}));
-        EXPECT_EQ(d.md.errorFlags, 0u);
-    }
-}
-
-TEST(DialoguePdu, Unidirectional) {
-    const Bytes uni = tlv(0x6B, tlv(0x28, cat({kUniDialogueAs,
-                                               tlv(0xA0, tlv(0x60, cat({kProtocolVersion, cap2()})))})));
-    const auto d = decode(tlv(0x61, cat({uni, hexBytes("6c 00")})));
-    EXPECT_EQ(d.find(3724)->text, "  UnidialoguePDU=2");
-    EXPECT_EQ(d.find(3728)->text, "Unidirectional Dialogue Tag=60");
-    EXPECT_EQ(d.find(3622)->id, 3622u);
-    EXPECT_EQ(d.find(3800)->text, "  version=2");
-    EXPECT_EQ(d.md.errorFlags, 0u);
 }
 
 // Indefinite lengths: the delimited constructs read their members through

@@ -6,9 +6,7 @@
 
 #include "support/harness.h"
 
-using camel::test::Bytes;
-using camel::test::decode;
-using camel::test::Span;
+using namespace camel::test;
 using Texts = std::vector<std::string>;
 
 namespace {

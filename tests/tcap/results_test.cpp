@@ -8,10 +8,7 @@
 
 #include "support/harness.h"
 
-using camel::test::Bytes;
-using camel::test::decode;
-using camel::test::tlv;
-using camel::test::hexBytes;
+using namespace camel::test;
 using Texts = std::vector<std::string>;
 
 namespace {

@@ -141,53 +141,42 @@ TEST(CaptureIpFragments, EveryOrderAndFault) {
 TEST(CaptureIpFragments, TimeOutsAndLimitsDropTheOldest) {
     const Bytes payload = sctpWith(kTcap);
     const std::vector<Piece> in = pieces(payload.size());
-    const auto walkAll = [&](cap::FrameWalker &w, Collect &sink, const std::vector<Bytes> &frames) {
-        for (const Bytes &f : frames)
-            w.walk(cap::linktype::kRaw, cap::Bytes{f.data(), f.size()}, sink);
-        w.endCapture();
+    // The first fragment, four frames of something else, the rest.
+    std::vector<Bytes> interrupted{fragmentFrame(false, payload, in[0])};
+    for (int i = 0; i < 4; ++i)
+        interrupted.push_back(cw::ipv4(kIpA, kIpB, 17, Bytes(8, 0), uint16_t(i)));
+    std::vector<Bytes> interleaved, v6;
+    for (const Piece &p : in) {
+        interleaved.push_back(fragmentFrame(false, payload, p, 1));
+        interleaved.push_back(fragmentFrame(false, payload, p, 2));
+        v6.push_back(fragmentFrame(true, payload, p));
+        if (&p != &in[0])
+            interrupted.push_back(fragmentFrame(false, payload, p));
+    }
+    struct Case {
+        const char *name;
+        cap::IpFragmentLimits limits;
+        const std::vector<Bytes> &frames;
+        cap::Skip skip;
+        uint64_t skipped;
+        size_t found;
+    } cases[] = {
+        {"the first times out, the rest never complete", {.timeoutFrames = 3}, interrupted,
+         cap::Skip::IpFragmentIncomplete, 5, 0},
+        {"room for one datagram: the older of two gives way", {.datagrams = 1}, interleaved,
+         cap::Skip::IpFragmentNoRoom, 9, 0},
+        {"fewer octets held than one datagram needs", {.pendingBytes = 64}, v6, cap::Skip::IpFragmentNoRoom, 5, 0},
     };
-    {
-        // The first fragment, four frames of something else, the rest: the
-        // first times out, the rest never complete.
+    for (const Case &c : cases) {
         cap::WalkOptions o;
-        o.ip.timeoutFrames = 3;
+        o.ip = c.limits;
         cap::FrameWalker walker(o);
         Collect sink;
-        std::vector<Bytes> frames{fragmentFrame(false, payload, in[0])};
-        for (int i = 0; i < 4; ++i)
-            frames.push_back(cw::ipv4(kIpA, kIpB, 17, Bytes(8, 0), uint16_t(i)));
-        for (size_t i = 1; i < in.size(); ++i)
-            frames.push_back(fragmentFrame(false, payload, in[i]));
-        walkAll(walker, sink, frames);
-        EXPECT_TRUE(sink.found.empty());
-        EXPECT_EQ(walker.skips()[size_t(cap::Skip::IpFragmentIncomplete)], 5u);
-    }
-    {
-        // Room for one datagram: of two interleaved ones the older gives way.
-        cap::WalkOptions o;
-        o.ip.datagrams = 1;
-        cap::FrameWalker walker(o);
-        Collect sink;
-        std::vector<Bytes> frames;
-        for (const Piece &p : in) {
-            frames.push_back(fragmentFrame(false, payload, p, 1));
-            frames.push_back(fragmentFrame(false, payload, p, 2));
-        }
-        walkAll(walker, sink, frames);
-        EXPECT_EQ(walker.skips()[size_t(cap::Skip::IpFragmentNoRoom)], 9u);
-    }
-    {
-        // Fewer octets held than one datagram needs: dropped, nothing held.
-        cap::WalkOptions o;
-        o.ip.pendingBytes = 64;
-        cap::FrameWalker walker(o);
-        Collect sink;
-        std::vector<Bytes> frames;
-        for (const Piece &p : in)
-            frames.push_back(fragmentFrame(true, payload, p));
-        walkAll(walker, sink, frames);
-        EXPECT_TRUE(sink.found.empty());
-        EXPECT_EQ(walker.skips()[size_t(cap::Skip::IpFragmentNoRoom)], 5u);
+        for (const Bytes &f : c.frames)
+            walker.walk(cap::linktype::kRaw, cap::Bytes{f.data(), f.size()}, sink);
+        walker.endCapture();
+        EXPECT_EQ(sink.found.size(), c.found) << c.name;
+        EXPECT_EQ(walker.skips()[size_t(c.skip)], c.skipped) << c.name;
     }
 }
 

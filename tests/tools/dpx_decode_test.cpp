@@ -23,29 +23,35 @@ namespace {
 using nlohmann::json;
 using Lines = std::vector<std::string>;
 
+// Sets the presence bit of a key entry and writes its slot.
+void mark(std::vector<uint8_t> &buf, uint32_t entry, std::vector<uint8_t> slot) {
+    buf[entry / 8] |= uint8_t(1u << (entry % 8));
+    std::copy(slot.begin(), slot.end(), buf.begin() + HOST_KEY_SLOT_BASE + 4 * entry);
+}
+
+Lines show(const std::vector<dpxdecode::KeyEntryOut> &entries) {
+    Lines got;
+    for (const auto &e : entries)
+        got.push_back(std::to_string(e.index) + ":" + e.value + "/" + std::to_string(e.bits) +
+                      (e.overflow ? " overflow" : ""));
+    return got;
+}
+
 TEST(DpxDecodeKeys, PresentEntriesAreReadInTheirStoredFormWithinTheBuffer) {
     std::vector<uint8_t> buf(256, 0);
-    const auto mark = [&](uint32_t entry, std::vector<uint8_t> slot) {
-        buf[entry / 8] |= uint8_t(1u << (entry % 8));
-        std::copy(slot.begin(), slot.end(), buf.begin() + HOST_KEY_SLOT_BASE + 4 * entry);
-    };
-    mark(0, {0x62, 0xEE});         // octet: one byte
-    mark(20, {0x10, 0x00});        // word: both bytes
-    mark(26, {12, 0, 200, 0});     // variable: 12 bits at 200
-    mark(21, {0, 0, 0x2C, 0x81});  // variable that did not fit
-    mark(29, {64, 0, 252, 0});     // 8 bytes wanted, 4 there
-    mark(17, {16, 0, 0xA0, 0x0F}); // wholly outside
-    mark(30, {0x99});              // an entry the module never sets
+    mark(buf, 0, {0x62, 0xEE});         // octet: one byte
+    mark(buf, 20, {0x10, 0x00});        // word: both bytes
+    mark(buf, 26, {12, 0, 200, 0});     // variable: 12 bits at 200
+    mark(buf, 21, {0, 0, 0x2C, 0x81});  // variable that did not fit
+    mark(buf, 29, {64, 0, 252, 0});     // 8 bytes wanted, 4 there
+    mark(buf, 17, {16, 0, 0xA0, 0x0F}); // wholly outside
+    mark(buf, 30, {0x99});              // an entry the module never sets
     buf[HOST_KEY_SLOT_BASE + 4] = 0x77; // entry 1 without its presence bit
     buf[200] = 0xAB;
     buf[201] = 0xC0;
     buf[252] = 0x01;
     buf[255] = 0x04;
-    Lines got;
-    for (const auto &e : dpxdecode::readKeyEntries(buf.data(), uint32_t(buf.size())))
-        got.push_back(std::to_string(e.index) + ":" + e.value + "/" + std::to_string(e.bits) +
-                      (e.overflow ? " overflow" : ""));
-    EXPECT_EQ(got, (Lines{"0:62/8", "17:/16", "20:1000/16", "21:/0 overflow", "26:ABC0/12", "29:01000004/64",
+    EXPECT_EQ(show(dpxdecode::readKeyEntries(buf.data(), uint32_t(buf.size()))), (Lines{"0:62/8", "17:/16", "20:1000/16", "21:/0 overflow", "26:ABC0/12", "29:01000004/64",
                           "30:/0"}));
 }
 
@@ -54,10 +60,6 @@ TEST(DpxDecodeKeys, PresentEntriesAreReadInTheirStoredFormWithinTheBuffer) {
 // before.
 TEST(DpxDecodeKeys, AReusedEntryListHoldsOnlyTheLastBuffersEntries) {
     std::vector<uint8_t> many(512, 0), few(512, 0);
-    const auto mark = [](std::vector<uint8_t> &buf, uint32_t entry, std::vector<uint8_t> slot) {
-        buf[entry / 8] |= uint8_t(1u << (entry % 8));
-        std::copy(slot.begin(), slot.end(), buf.begin() + HOST_KEY_SLOT_BASE + 4 * entry);
-    };
     mark(many, 0, {0x65});
     mark(many, 17, {64, 0, 200, 0}); // 16 hex digits: longer than a short string holds
     mark(many, 21, {0, 0, 0x2C, 0x81});
@@ -66,13 +68,6 @@ TEST(DpxDecodeKeys, AReusedEntryListHoldsOnlyTheLastBuffersEntries) {
         many[200 + i] = uint8_t(0x11 * (i + 1));
     mark(few, 17, {8, 0, 128, 0});
     few[128] = 0x5A;
-    const auto show = [](const std::vector<dpxdecode::KeyEntryOut> &entries) {
-        Lines got;
-        for (const auto &e : entries)
-            got.push_back(std::to_string(e.index) + ":" + e.value + "/" + std::to_string(e.bits) +
-                          (e.overflow ? " overflow" : ""));
-        return got;
-    };
     std::vector<dpxdecode::KeyEntryOut> entries;
     dpxdecode::readKeyEntries(many.data(), 512, entries);
     EXPECT_EQ(show(entries), (Lines{"0:65/8", "17:1122334455667788/64", "21:/0 overflow", "26:99AABBCC/32"}));
