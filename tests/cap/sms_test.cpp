@@ -72,8 +72,9 @@ TEST(SmsInitialDp, TpOctetsByLayout) {
           "  Message Class=Class 2 (u)sim Specificmessage"},
          0},
         {"8B 01 85", 2274, {"  Coding Group="}, 0},
-        {"8B 01 D9", 2274,
-         {"  Coding Group=Store Message(13)", "  Indication Sense=Set Indication Active",
+        // Sense bit 4 clear beside the group's set bit 5.
+        {"8B 01 D1", 2274,
+         {"  Coding Group=Store Message(13)", "  Indication Sense=Voicemail Messagewaiting",
           "  Indication Type=Fax Messagewaiting"},
          0},
         {"8B 01 F6", 2274,
