@@ -11,65 +11,17 @@
 #include <vector>
 
 #include "carriers/link.h"
-#include "carriers/walker.h"
-#include "capture_writer.h"
+#include "support/capture_frames.h"
 
 namespace {
 
-namespace cw = capwrite;
-namespace cap = dpxdecode::capture;
-using cw::Bytes;
+using namespace captest;
 
 const Bytes kTcap{0x62, 0x06, 0x48, 0x04, 0x01, 0x02, 0x03, 0x04};
 const Bytes kTcap2{0x64, 0x06, 0x49, 0x04, 0x0A, 0x0B, 0x0C, 0x0D};
-const cw::Mac kMacA{{2, 0, 0, 0, 0, 1}}, kMacB{{2, 0, 0, 0, 0, 2}};
-const cw::Ipv4Address kIpA{{10, 0, 0, 1}}, kIpB{{10, 0, 0, 2}};
-const cw::Ipv6Address kIp6A{{0x20, 0x01, 0x0d, 0xb8, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 1}};
-const cw::Ipv6Address kIp6B{{0x20, 0x01, 0x0d, 0xb8, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 2}};
 const cw::RoutingLabel kLabel{1234, 5678, 3, 2, false};
 const cw::SccpAddress kCalled{146, false, 0}, kCalling{146, true, 1234};
 
-struct Found {
-    Bytes tcap;
-    cap::TcapMessage where;
-};
-
-struct Collect final : cap::MessageSink {
-    std::vector<Found> found;
-    void onTcap(const cap::TcapMessage &m) override {
-        found.push_back(Found{Bytes(m.tcap.data, m.tcap.data + m.tcap.size), m});
-    }
-};
-
-uint64_t skipTotal(const cap::FrameWalker &w) {
-    uint64_t n = 0;
-    for (const uint64_t c : w.skips())
-        n += c;
-    return n;
-}
-
-// Walks each frame in turn on one walker; the frames are copied into
-// buffers of exactly their size so a read past one is caught by ASan.
-struct Walk {
-    cap::FrameWalker walker;
-    Collect sink;
-    explicit Walk(const cap::WalkOptions &o = {}) : walker(o) {}
-    size_t operator()(uint32_t link, const Bytes &frame) {
-        std::vector<uint8_t> exact(frame);
-        return walker.walk(link, cap::Bytes{exact.data(), exact.size()}, sink);
-    }
-    uint64_t skipped(cap::Skip s) const { return walker.skips()[size_t(s)]; }
-};
-
-Bytes sctpData(const Bytes &user, uint32_t ppid, uint32_t tsn = 1, uint16_t port = cw::kPortM3ua) {
-    cw::DataChunk c;
-    c.tsn = tsn;
-    c.ppid = ppid;
-    c.data = user;
-    return cw::sctpPacket(port, port, 0x11223344, {c});
-}
-
-Bytes overIpv4(const Bytes &sctp) { return cw::ipv4(kIpA, kIpB, cw::kIpProtoSctp, sctp, 7); }
 Bytes m3uaUdt(const Bytes &tcap = kTcap) {
     return cw::m3uaData(kLabel, cw::sccpUdt(tcap, kCalled, kCalling, {}));
 }

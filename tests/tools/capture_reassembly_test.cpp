@@ -6,23 +6,16 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <numeric>
 #include <string>
 #include <vector>
 
-#include "capture_writer.h"
 #include "carriers/link.h"
-#include "carriers/walker.h"
+#include "support/capture_frames.h"
 
 namespace {
 
-namespace cw = capwrite;
-namespace cap = dpxdecode::capture;
-using cw::Bytes;
+using namespace captest;
 
-const cw::Ipv4Address kIpA{{10, 0, 0, 1}}, kIpB{{10, 0, 0, 2}};
-const cw::Ipv6Address kIp6A{{0x20, 0x01, 0x0d, 0xb8, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 1}};
-const cw::Ipv6Address kIp6B{{0x20, 0x01, 0x0d, 0xb8, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 2}};
 const cw::RoutingLabel kLabel{1234, 5678, 3, 2, false};
 
 // A Begin with a 72-octet component portion: an SCTP packet of some 150
@@ -34,22 +27,8 @@ const Bytes kTcap = [] {
     return b;
 }();
 
-struct Collect final : cap::MessageSink {
-    std::vector<Bytes> found;
-    void onTcap(const cap::TcapMessage &m) override { found.emplace_back(m.tcap.data, m.tcap.data + m.tcap.size); }
-};
-
-uint64_t skipTotal(const cap::FrameWalker &w) {
-    const auto &s = w.skips();
-    return std::accumulate(s.begin(), s.end(), uint64_t{0});
-}
-
 Bytes sctpWith(const Bytes &tcap, uint8_t calledSsn = 146, uint8_t callingSsn = 146, uint32_t tsn = 1) {
-    cw::DataChunk c;
-    c.tsn = tsn;
-    c.ppid = cw::kPpidM3ua;
-    c.data = cw::m3uaData(kLabel, cw::sccpUdt(tcap, {calledSsn, false, 0}, {callingSsn, false, 0}, {}));
-    return cw::sctpPacket(2905, 2905, 7, {c});
+    return m3uaPacket(tcap, kLabel, {calledSsn, false, 0}, {callingSsn, false, 0}, tsn, 7);
 }
 
 struct Piece {
@@ -119,20 +98,17 @@ TEST(CaptureIpFragments, EveryOrderAndFault) {
     for (const bool v6 : {false, true}) {
         for (const auto &c : cases) {
             SCOPED_TRACE(std::string(v6 ? "IPv6: " : "IPv4: ") + c.name);
-            cap::FrameWalker walker;
-            Collect sink;
-            for (size_t i = 0; i < c.order.size(); ++i) {
-                const Bytes f = fragmentFrame(v6, i == c.alteredAt ? altered : padded, c.order[i]);
-                walker.walk(cap::linktype::kRaw, cap::Bytes{f.data(), f.size()}, sink);
-            }
-            walker.endCapture();
-            ASSERT_EQ(sink.found.size(), c.messages);
+            Walk walk;
+            for (size_t i = 0; i < c.order.size(); ++i)
+                walk(cap::linktype::kRaw, fragmentFrame(v6, i == c.alteredAt ? altered : padded, c.order[i]));
+            walk.walker.endCapture();
+            ASSERT_EQ(walk.sink.found.size(), c.messages);
             if (c.messages != 0) {
-                EXPECT_EQ(sink.found[0], kTcap);
+                EXPECT_EQ(walk.sink.found[0].tcap, kTcap);
             }
-            EXPECT_EQ(skipTotal(walker), c.skipped);
+            EXPECT_EQ(skipTotal(walk.walker), c.skipped);
             if (c.why != cap::Skip::None) {
-                EXPECT_EQ(walker.skips()[size_t(c.why)], c.skipped) << cap::skipName(c.why);
+                EXPECT_EQ(walk.skipped(c.why), c.skipped) << cap::skipName(c.why);
             }
         }
     }
@@ -170,13 +146,12 @@ TEST(CaptureIpFragments, TimeOutsAndLimitsDropTheOldest) {
     for (const Case &c : cases) {
         cap::WalkOptions o;
         o.ip = c.limits;
-        cap::FrameWalker walker(o);
-        Collect sink;
+        Walk walk(o);
         for (const Bytes &f : c.frames)
-            walker.walk(cap::linktype::kRaw, cap::Bytes{f.data(), f.size()}, sink);
-        walker.endCapture();
-        EXPECT_EQ(sink.found.size(), c.found) << c.name;
-        EXPECT_EQ(walker.skips()[size_t(c.skip)], c.skipped) << c.name;
+            walk(cap::linktype::kRaw, f);
+        walk.walker.endCapture();
+        EXPECT_EQ(walk.sink.found.size(), c.found) << c.name;
+        EXPECT_EQ(walk.skipped(c.skip), c.skipped) << c.name;
     }
 }
 
@@ -263,19 +238,17 @@ TEST(CaptureCamelDialogues, FollowedBothWaysByTheirTransactionIds) {
         SCOPED_TRACE(byDialogue ? "default" : "--ssn 146");
         cap::WalkOptions o;
         o.camelDialogues = byDialogue;
-        cap::FrameWalker walker(o);
-        Collect sink;
+        Walk walk(o);
         uint32_t tsn = 1;
         for (const auto &m : flow) {
             SCOPED_TRACE(m.name);
-            const Bytes ip = cw::ipv4(kIpA, kIpB, cw::kIpProtoSctp, sctpWith(m.tcap, m.called, m.calling, tsn++), 1);
-            const size_t found = walker.walk(cap::linktype::kRaw, cap::Bytes{ip.data(), ip.size()}, sink);
+            const size_t found = walk(cap::linktype::kRaw, overIpv4(sctpWith(m.tcap, m.called, m.calling, tsn++), 1));
             EXPECT_EQ(found, (byDialogue ? m.taken : m.called == 146) ? 1u : 0u);
         }
         const cap::Skip why = byDialogue ? cap::Skip::TcapNotCamel : cap::Skip::SccpSsnNotSelected;
-        EXPECT_EQ(walker.skips()[size_t(why)], byDialogue ? 3u : 13u);
-        EXPECT_EQ(walker.sccpCounts().byCalledSsn[10], 8u);
-        EXPECT_EQ(walker.sccpCounts().byCalledSsn[6] + walker.sccpCounts().byCalledSsn[7], 2u);
+        EXPECT_EQ(walk.skipped(why), byDialogue ? 3u : 13u);
+        EXPECT_EQ(walk.walker.sccpCounts().byCalledSsn[10], 8u);
+        EXPECT_EQ(walk.walker.sccpCounts().byCalledSsn[6] + walk.walker.sccpCounts().byCalledSsn[7], 2u);
     }
 }
 

@@ -13,7 +13,7 @@
 #include <string>
 #include <vector>
 
-#include "capture_writer.h"
+#include "support/capture_frames.h"
 #include "support/dpx_decode_run.h"
 
 namespace {
@@ -25,7 +25,6 @@ using Lines = std::vector<std::string>;
 
 const Bytes kBegin{0x62, 0x06, 0x48, 0x04, 0x01, 0x02, 0x03, 0x04};
 const Bytes kEnd{0x64, 0x06, 0x49, 0x04, 0x01, 0x02, 0x03, 0x04};
-constexpr uint64_t kStart = 1767225600ull * 1000000000ull; // 2026-01-01
 
 using dpxtest::Outcome;
 using dpxtest::quote;
@@ -42,22 +41,11 @@ Outcome run(const std::string &args, const Bytes &input = {}) {
 // Ethernet/IPv4/SCTP/M3UA/SCCP UDT, one millisecond apart.
 Bytes capture(const std::vector<Bytes> &messages, cw::FileFormat format = cw::FileFormat::Pcap) {
     std::vector<std::pair<uint64_t, Bytes>> frames;
-    const cw::Mac a{{2, 0, 0, 0, 0, 1}}, b{{2, 0, 0, 0, 0, 2}};
-    const cw::RoutingLabel label{100, 200, 0, 2, false};
     for (size_t i = 0; i < messages.size(); ++i) {
-        Bytes frame;
-        if (messages[i].empty()) {
-            frame = cw::ethernet(b, a, 0x0806, Bytes(28, 0));
-        } else {
-            cw::DataChunk c;
-            c.tsn = uint32_t(i + 1);
-            c.ppid = cw::kPpidM3ua;
-            c.data = cw::m3uaData(label, cw::sccpUdt(messages[i], {146, false, 0}, {147, false, 0}, {}));
-            frame = cw::ethernet(b, a, cw::kEtherIpv4,
-                                 cw::ipv4({{10, 0, 0, 1}}, {{10, 0, 0, 2}}, cw::kIpProtoSctp,
-                                          cw::sctpPacket(2905, 2905, 1, {c}), uint16_t(i)));
-        }
-        frames.emplace_back(kStart + i * 1000000, frame);
+        const Bytes frame = messages[i].empty() ? cw::ethernet(captest::kMacB, captest::kMacA, 0x0806, Bytes(28, 0))
+                                                : captest::m3uaFrame(messages[i], {100, 200, 0, 2, false}, {146, false, 0},
+                                                                     {147, false, 0}, uint32_t(i + 1), uint16_t(i));
+        frames.emplace_back(captest::kStart + i * 1000000, frame);
     }
     cw::FileOptions options;
     options.format = format;

@@ -12,8 +12,8 @@
 #include <string>
 #include <vector>
 
-#include "capture_writer.h"
 #include "parallel/records.h"
+#include "support/capture_frames.h"
 #include "support/dpx_decode_run.h"
 
 namespace {
@@ -46,19 +46,12 @@ std::vector<cw::Bytes> sampleMessages() {
 std::string generatedCapture() {
     const std::vector<cw::Bytes> flow = sampleMessages();
     std::vector<std::pair<uint64_t, cw::Bytes>> frames;
-    const cw::Mac a{{2, 0, 0, 0, 0, 1}}, b{{2, 0, 0, 0, 0, 2}};
-    const uint64_t start = 1767225600ull * 1000000000ull;
     for (size_t i = 0; i < flow.size() * 40; ++i) {
         const bool forward = i % 2 == 0;
         const cw::RoutingLabel label{forward ? 100u : 200u, forward ? 200u : 100u, 0, 2, false};
-        cw::DataChunk c;
-        c.tsn = uint32_t(i + 1);
-        c.ppid = cw::kPpidM3ua;
-        c.data = cw::m3uaData(label, cw::sccpUdt(flow[i % flow.size()], {146, false, 0}, {146, false, 0}, {}));
-        frames.emplace_back(start + i * 1000000,
-                            cw::ethernet(forward ? b : a, forward ? a : b, cw::kEtherIpv4,
-                                         cw::ipv4({{10, 0, 0, 1}}, {{10, 0, 0, 2}}, cw::kIpProtoSctp,
-                                                  cw::sctpPacket(2905, 2905, 1, {c}), uint16_t(i))));
+        frames.emplace_back(captest::kStart + i * 1000000,
+                            captest::m3uaFrame(flow[i % flow.size()], label, {146, false, 0}, {146, false, 0},
+                                               uint32_t(i + 1), uint16_t(i), forward));
     }
     const cw::Bytes bytes = cw::captureBytes(cw::FileOptions{}, frames);
     return dpxtest::tempFile("generated.pcap", std::string(bytes.begin(), bytes.end()));
