@@ -73,8 +73,7 @@ inline std::string describeChar(char c) {
     const auto u = static_cast<unsigned char>(c);
     if (u >= 0x21 && u <= 0x7E)
         return std::string("'") + c + "'";
-    static const char digits[] = "0123456789ABCDEF";
-    return std::string("byte 0x") + digits[u >> 4] + digits[u & 0xF];
+    return std::string("byte 0x") + detail::kHexOut.pair[u][0] + detail::kHexOut.pair[u][1];
 }
 
 // Parses `line` into `out`, whose byte vector keeps its capacity from line
